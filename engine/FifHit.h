@@ -1,0 +1,51 @@
+#pragma once
+
+#include "fif_export.h"
+
+#include <QList>
+#include <QMetaType>
+#include <QPointer>
+#include <QString>
+
+namespace Gui {
+namespace Orba {
+
+class FifJob;
+class MainWindow;
+
+// One matching line of one file.
+class FIF_EXPORT FifHit
+{
+public:
+    FifHit();
+    // Note the argument order, which differs from the members'.
+    FifHit(const QString& file, int line, const QString& text, int offset, int rawOffset,
+           FifJob* job);
+    FifHit(const FifHit& other);
+    FifHit& operator=(const FifHit& other);
+    ~FifHit();
+
+    // A line number of 0 or more, and the job that found it still exists.
+    bool isValid() const;
+    // "file (line): text" with native separators; empty for an invalid hit.
+    QString toString() const;
+    // The file's absolute canonical path, relative paths taken from the job's
+    // working directory; empty when invalid or the file is gone.
+    QString getCanonicalFilePath() const;
+    MainWindow* getMainWindow() const;
+
+    QPointer<FifJob> job;
+    QString file;
+    int line;
+    int offset;     // characters before the match, each line break counted as one
+    int rawOffset;  // the same with line breaks counted as stored
+    QString text;   // the line without its terminator
+};
+
+typedef QList<FifHit> FifHitList;
+
+} // namespace Orba
+} // namespace Gui
+
+Q_DECLARE_METATYPE(Gui::Orba::FifHit)
+Q_DECLARE_METATYPE(Gui::Orba::FifHitList)

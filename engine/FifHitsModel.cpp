@@ -1,0 +1,104 @@
+#include "FifHitsModel.h"
+
+#include "FifJob.h"
+
+namespace Gui {
+namespace Orba {
+
+FifHitsModel::FifHitsModel(QObject* parent)
+    : QAbstractListModel(parent)
+{
+}
+
+FifHitsModel::~FifHitsModel() = default;
+
+int FifHitsModel::rowCount(const QModelIndex& parent) const
+{
+    if (parent.isValid())
+        return 0;
+    QReadLocker locker(&lock);
+    return int(hits.size());
+}
+
+QVariant FifHitsModel::data(const QModelIndex& index, int role) const
+{
+    if (!index.isValid())
+        return QVariant();
+    FifHit hit;
+    {
+        QReadLocker locker(&lock);
+        if (index.row() >= hits.size())
+            return QVariant();
+        hit = hits.at(index.row());
+    }
+    switch (role) {
+    case Qt::DisplayRole:
+        return hit.toString();
+    case Qt::ToolTipRole:
+    case Qt::StatusTipRole:
+        return hit.text;
+    case Qt::UserRole:
+        return QVariant::fromValue(hit);
+    default:
+        return QVariant();
+    }
+}
+
+bool FifHitsModel::setData(const QModelIndex& index, const QVariant& value, int role)
+{
+    if (!index.isValid() || role != Qt::EditRole)
+        return false;
+    {
+        QWriteLocker locker(&lock);
+        if (index.row() >= hits.size())
+            return false;
+        hits[index.row()] = value.value<FifHit>();
+    }
+    emit dataChanged(index, index);
+    return true;
+}
+
+QVariant FifHitsModel::headerData(int section, Qt::Orientation orientation, int role) const
+{
+    if (role != Qt::DisplayRole)
+        return QVariant();
+    if (orientation == Qt::Vertical)
+        return QStringLiteral("%1").arg(section);
+
+    // The GUI thread is the only writer, so it may read without the lock.
+    if (!hits.isEmpty() && hits.constFirst().job)
+        return hits.constFirst().job->getInput().toString();
+    return tr("No Search Results");
+}
+
+bool FifHitsModel::insertRows(int row, int count, const QModelIndex& /*parent*/)
+{
+    if (count < 1 || row < 0 || row > rowCount())
+        return false;
+    beginInsertRows(QModelIndex(), row, row + count - 1);
+    {
+        QWriteLocker locker(&lock);
+        hits.insert(row, count, FifHit());
+    }
+    endInsertRows();
+    return true;
+}
+
+bool FifHitsModel::removeRows(int row, int count, const QModelIndex& /*parent*/)
+{
+    const int size = rowCount();
+    if (count < 1 || row < 0 || row >= size)
+        return false;
+    // Views are told only of rows that exist.
+    const int last = qMin(row + count, size) - 1;
+    beginRemoveRows(QModelIndex(), row, last);
+    {
+        QWriteLocker locker(&lock);
+        hits.remove(row, last - row + 1);
+    }
+    endRemoveRows();
+    return true;
+}
+
+} // namespace Orba
+} // namespace Gui

@@ -1,0 +1,41 @@
+#pragma once
+
+#include "fif_export.h"
+#include "FifHit.h"
+
+#include <QAbstractListModel>
+#include <QReadWriteLock>
+
+namespace Gui {
+namespace Orba {
+
+// The hits of one job, one row per hit. Rows are changed in the GUI thread
+// only; the search thread reads the row count, hence the lock.
+class FIF_EXPORT FifHitsModel : public QAbstractListModel
+{
+    Q_OBJECT
+
+public:
+    explicit FifHitsModel(QObject* parent);
+    ~FifHitsModel() override;
+
+    int rowCount(const QModelIndex& parent = QModelIndex()) const override;
+    // Display: "file (line): text"; tool and status tip: the line's text;
+    // Qt::UserRole: the FifHit itself.
+    QVariant data(const QModelIndex& index, int role) const override;
+    // Writes the FifHit held by `value` (Qt::EditRole only).
+    bool setData(const QModelIndex& index, const QVariant& value, int role) override;
+    // Horizontal: the description of the search shown, or "No Search Results".
+    QVariant headerData(int section, Qt::Orientation orientation,
+                        int role = Qt::DisplayRole) const override;
+    // Inserts placeholder (invalid) hits.
+    bool insertRows(int row, int count, const QModelIndex& parent = QModelIndex()) override;
+    bool removeRows(int row, int count, const QModelIndex& parent = QModelIndex()) override;
+
+private:
+    QList<FifHit> hits;
+    mutable QReadWriteLock lock;
+};
+
+} // namespace Orba
+} // namespace Gui

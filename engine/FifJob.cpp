@@ -1,0 +1,164 @@
+#include "FifJob.h"
+
+#include "FifHitsModel.h"
+#include "FifManager.h"
+#include "FifWorker.h"
+
+namespace Gui {
+namespace Orba {
+
+FifJob::FifJob(FifManager* manager)
+    : QThread(manager)
+    , workingDir(QString())
+{
+    // QThread emits finished() just before it marks itself as not running.
+    // Joining the thread here, ahead of every other receiver of finished(),
+    // lets those receivers rely on isRunning() being false.
+    connect(this, &QThread::finished, this, [this] { wait(); });
+}
+
+FifJob::~FifJob()
+{
+    if (isRunning()) {
+        setShouldStop(true);
+        wait();
+    }
+}
+
+bool FifJob::start(const FifInput& request)
+{
+    if (isRunning())
+        return false;
+
+    input = request;
+    FifHitsModel* model = getHitsModel();
+    const int rows = model->rowCount(QModelIndex());
+    if (rows > 0)
+        model->removeRows(0, rows, QModelIndex());
+    {
+        // The thread is not running, but the lock keeps the counters' rule simple.
+        QWriteLocker locker(&lock);
+        readFileCount = 0;
+        fileHitCount = 0;
+    }
+    workingDir = QDir::current();
+    emit aboutToStart();
+    QThread::start(QThread::InheritPriority);
+    return true;
+}
+
+bool FifJob::shouldStop() const
+{
+    QReadLocker locker(&lock);
+    return stopFlag;
+}
+
+void FifJob::setShouldStop(bool value)
+{
+    QWriteLocker locker(&lock);
+    stopFlag = value;
+}
+
+void FifJob::stop()
+{
+    setShouldStop(true);
+}
+
+int FifJob::getReadFileCount() const
+{
+    QReadLocker locker(&lock);
+    return readFileCount;
+}
+
+int FifJob::getFileHitCount() const
+{
+    QReadLocker locker(&lock);
+    return fileHitCount;
+}
+
+void FifJob::incrementReadFileCount()
+{
+    QWriteLocker locker(&lock);
+    ++readFileCount;
+}
+
+void FifJob::incrementFileHitCount()
+{
+    QWriteLocker locker(&lock);
+    ++fileHitCount;
+}
+
+int FifJob::getLineHitCount() const
+{
+    return hitsModel ? hitsModel->rowCount(QModelIndex()) : 0;
+}
+
+FifInput FifJob::getInput() const
+{
+    return input;
+}
+
+QDir FifJob::getWorkingDir() const
+{
+    return workingDir;
+}
+
+void FifJob::setWorkingDir(QDir dir)
+{
+    workingDir = dir;
+}
+
+FifHitsModel* FifJob::getHitsModel() const
+{
+    if (!hitsModel)
+        hitsModel = new FifHitsModel(const_cast<FifJob*>(this));
+    return hitsModel;
+}
+
+FifManager* FifJob::getManager() const
+{
+    return qobject_cast<FifManager*>(parent());
+}
+
+MainWindow* FifJob::getMainWindow() const
+{
+    FifManager* manager = getManager();
+    return manager ? manager->getMainWindow() : nullptr;
+}
+
+void FifJob::appendHit(const FifHit& hit)
+{
+    if (!hit.isValid())
+        return;
+    FifHitsModel* model = getHitsModel();
+    const int row = model->rowCount(QModelIndex());
+    model->insertRow(row, QModelIndex());
+    model->setData(model->index(row, 0), QVariant::fromValue(hit), Qt::EditRole);
+}
+
+void FifJob::appendHits(const FifHitList& hits)
+{
+    int count = 0;
+    for (const FifHit& hit : hits)
+        count += hit.isValid() ? 1 : 0;
+    if (count == 0)
+        return;
+    FifHitsModel* model = getHitsModel();
+    int row = model->rowCount(QModelIndex());
+    model->insertRows(row, count, QModelIndex());
+    for (const FifHit& hit : hits) {
+        if (!hit.isValid())
+            continue;
+        model->setData(model->index(row, 0), QVariant::fromValue(hit), Qt::EditRole);
+        ++row;
+    }
+}
+
+void FifJob::run()
+{
+    FifWorker worker(this);
+    worker.searchFolders();
+}
+
+} // namespace Orba
+} // namespace Gui

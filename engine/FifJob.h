@@ -1,0 +1,81 @@
+#pragma once
+
+#include "fif_export.h"
+#include "FifHit.h"
+#include "FifInput.h"
+
+#include <QDir>
+#include <QReadWriteLock>
+#include <QThread>
+
+namespace Gui {
+namespace Orba {
+
+class FifHitsModel;
+class FifManager;
+class MainWindow;
+
+// One search slot of a main window: runs one search at a time on its own
+// thread and keeps its request, hits, counters and stop flag.
+//
+// The counters and the stop flag are shared with the search thread and are
+// only touched under `lock`; the hits model is changed in the GUI thread only.
+class FIF_EXPORT FifJob : public QThread
+{
+    Q_OBJECT
+
+public:
+    explicit FifJob(FifManager* manager);
+    // Stops a running search and waits until its thread has ended, so that
+    // the search never outlives the job.
+    ~FifJob() override;
+
+    // Empties the model, zeroes the counters, notes the current directory,
+    // emits aboutToStart() and starts the search thread. A job whose thread
+    // still runs refuses: the call then changes nothing and returns false.
+    bool start(const FifInput& request);
+
+    bool shouldStop() const;
+    void setShouldStop(bool stop);
+
+    int getReadFileCount() const;
+    int getFileHitCount() const;
+    void incrementReadFileCount();
+    void incrementFileHitCount();
+    // The number of rows of the hits model, 0 while there is none.
+    int getLineHitCount() const;
+
+    FifInput getInput() const;
+    QDir getWorkingDir() const;
+    void setWorkingDir(QDir dir);
+    // Created on first use, owned by the job.
+    FifHitsModel* getHitsModel() const;
+
+    FifManager* getManager() const;
+    MainWindow* getMainWindow() const;
+
+signals:
+    void aboutToStart();
+    void searching(const QString& file);
+
+public slots:
+    void appendHit(const Gui::Orba::FifHit& hit);
+    void appendHits(const Gui::Orba::FifHitList& hits);
+    // Asks the running search to end; does not wait.
+    void stop();
+
+protected:
+    void run() override;
+
+private:
+    mutable FifHitsModel* hitsModel = nullptr;
+    QDir workingDir;
+    FifInput input;
+    mutable QReadWriteLock lock;
+    int readFileCount = 0;
+    int fileHitCount = 0;
+    bool stopFlag = false;
+};
+
+} // namespace Orba
+} // namespace Gui

@@ -1,0 +1,62 @@
+#pragma once
+
+#include <QString>
+#include <QtCore5Compat/QRegExp>
+
+#include <functional>
+
+class QIODevice;
+
+namespace Gui {
+namespace Orba {
+
+// Reads a text file line by line and reports the first match of each line.
+// It knows nothing of jobs or signals, so it can be driven by any reader.
+//
+// Lines are physical lines, whatever their length; "\n" ends a line and a
+// "\r" before it belongs to the terminator. Files that start with a UTF-16
+// byte-order mark are read as UTF-16, all others as UTF-8; a byte-order mark
+// is not part of the text and is not counted. Offsets count the characters
+// (UTF-16 code units) of every line as decoded.
+class FifLineScanner
+{
+public:
+    struct Match
+    {
+        int line;       // from 1
+        int offset;     // characters before the match, line breaks counted as one
+        int rawOffset;  // the same, line breaks counted as stored
+        QString text;   // the line without its terminator
+    };
+
+    // Called for every matching line.
+    using MatchSink = std::function<void(const Match&)>;
+    // Polled every `pollInterval` lines; true ends the scan.
+    using StopPoll = std::function<bool()>;
+
+    explicit FifLineScanner(const QRegExp& expression);
+
+    // Lines longer than this many bytes are matched on their first
+    // `maxLineBytes` only; the numbers and offsets of later lines stay true.
+    static constexpr qint64 maxLineBytes = 16 * 1024 * 1024;
+    static constexpr int pollInterval = 100;
+
+    // Returns whether any line matched.
+    bool scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
+
+private:
+    bool scanUtf8(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
+    bool scanUtf16(QIODevice& device, bool bigEndian, const MatchSink& sink,
+                   const StopPoll& shouldStop);
+    // Matches one line and advances the counters past it.
+    bool matchLine(const QString& text, int terminatorLength, qint64 extraChars,
+                   const MatchSink& sink);
+
+    QRegExp rx;
+    qint64 lineNumber = 1;
+    qint64 offset = 0;
+    qint64 rawOffset = 0;
+};
+
+} // namespace Orba
+} // namespace Gui

@@ -1,0 +1,153 @@
+#include "FifWorker.h"
+
+#include "FifJob.h"
+#include "FifLineScanner.h"
+
+#include <QFile>
+#include <QFileInfo>
+#include <QTextStream>
+
+namespace Gui {
+namespace Orba {
+
+FifWorker::FifWorker(FifJob* owner)
+    : job(owner)
+{
+    if (!job)
+        return;
+    input = job->getInput();
+    connect(this, &FifWorker::searching, job, &FifJob::searching);
+    connect(this, qOverload<const FifHit&>(&FifWorker::found), job, &FifJob::appendHit);
+    connect(this, qOverload<const FifHitList&>(&FifWorker::found), job, &FifJob::appendHits);
+}
+
+FifWorker::~FifWorker()
+{
+    if (job)
+        job->setShouldStop(false);
+}
+
+void FifWorker::searchFolders()
+{
+    const QString separator = QObject::tr(";");
+    const QStringList parts =
+        input.where.split(separator, Qt::SkipEmptyParts, Qt::CaseSensitive);
+    QList<QDir> folders;
+    for (const QString& part : parts) {
+        QDir folder;
+        if (part == QObject::tr("Current Directory"))
+            folder = QDir::current();
+        else if (part == QObject::tr("Home Directory"))
+            folder = QDir::home();
+        else if (part == QObject::tr("Root Directory"))
+            folder = QDir::root();
+        else
+            folder = QDir(part);
+        addFolder(folder, folders);
+    }
+    for (const QDir& folder : qAsConst(folders)) {
+        if (job && job->shouldStop())
+            return;
+        searchFolder(folder);
+    }
+}
+
+void FifWorker::addFolder(QDir& folder, QList<QDir>& folders)
+{
+    folder.setNameFilters(
+        input.filter.split(QObject::tr(";"), Qt::SkipEmptyParts, Qt::CaseSensitive));
+    folder.setFilter(QDir::Files | QDir::NoSymLinks | QDir::Hidden | QDir::AllDirs
+                     | QDir::NoDotAndDotDot);
+    folder.setSorting(QDir::NoSort);
+    if (folder.exists())
+        folders.append(folder);
+}
+
+void FifWorker::searchFolder(const QDir& folder)
+{
+    const QFileInfoList entries = folder.entryInfoList();
+    for (const QFileInfo& entry : entries) {
+        if (job && job->shouldStop())
+            return;
+        if (isTextFile(entry))
+            searchFile(entry.filePath());
+        if (input.includeSubFolders && entry.isDir()) {
+            QDir subFolder = folder;
+            subFolder.setPath(entry.filePath());
+            if (subFolder.exists())
+                searchFolder(subFolder);
+        }
+    }
+}
+
+bool FifWorker::isTextFile(const QFileInfo& info)
+{
+    if (!info.isFile() || !info.isReadable())
+        return false;
+    QFile file(info.filePath());
+    if (!file.open(QIODevice::ReadOnly))
+        return false;
+    QTextStream stream(&file);
+    bool control = false;
+    for (int lines = 0; lines < 20 && !control && !stream.atEnd(); ++lines) {
+        const QString line = stream.readLine();
+        for (const QChar c : line) {
+            if (c.category() == QChar::Other_Control && !c.isSpace()) {
+                control = true;
+                break;
+            }
+        }
+    }
+    return !control;
+}
+
+void FifWorker::searchFile(const QString& path)
+{
+    QFile file(path);
+    if (!file.open(QIODevice::ReadOnly))
+        return;
+    if (job)
+        job->incrementReadFileCount();
+    emit searching(path);
+
+    FifLineScanner scanner(input.getRegExp());
+    FifHitList batch;
+    const bool hasHit = scanner.scan(
+        file,
+        [&](const FifLineScanner::Match& match) {
+            sendHit(FifHit(path, match.line, match.text, match.offset, match.rawOffset, job),
+                    batch);
+        },
+        [this] { return job && job->shouldStop(); });
+
+    if (hasHit && job)
+        job->incrementFileHitCount();
+    if (!batch.isEmpty())
+        emit found(batch);
+}
+
+void FifWorker::sendHit(const FifHit& hit, FifHitList& batch)
+{
+    // The first hits of a search go singly, so they show at once; later ones
+    // in batches whose size grows with the rows the model already holds.
+    const int rows = job ? job->getLineHitCount() : 0;
+    if (rows < 10) {
+        // Rows can drop when the view is cleared during a search; what is
+        // waiting in the batch goes first so the order stays.
+        if (!batch.isEmpty()) {
+            emit found(batch);
+            batch.clear();
+        }
+        emit found(hit);
+        return;
+    }
+    const int limit = qBound(10, 2 * rows, 100);
+    if (batch.size() > limit) {
+        emit found(batch);
+        batch.clear();
+    }
+    batch.append(hit);
+}
+
+} // namespace Orba
+} // namespace Gui
