@@ -84,6 +84,22 @@ bool FifHitsModel::insertRows(int row, int count, const QModelIndex& /*parent*/)
     return true;
 }
 
+void FifHitsModel::appendValidHits(const FifHitList& batch, int validCount)
+{
+    if (validCount < 1)
+        return;
+    const int row = rowCount();
+    beginInsertRows(QModelIndex(), row, row + validCount - 1);
+    {
+        QWriteLocker locker(&lock);
+        for (const FifHit& hit : batch) {
+            if (hit.isValid())
+                hits.append(hit);
+        }
+    }
+    endInsertRows();
+}
+
 bool FifHitsModel::removeRows(int row, int count, const QModelIndex& /*parent*/)
 {
     const int size = rowCount();

@@ -33,6 +33,11 @@ public:
     bool removeRows(int row, int count, const QModelIndex& parent = QModelIndex()) override;
 
 private:
+    friend class FifJob;
+    // Appends the valid hits of `batch` in its order, announced to views as
+    // one insertion of rows that already hold their hits.
+    void appendValidHits(const FifHitList& batch, int validCount);
+
     QList<FifHit> hits;
     mutable QReadWriteLock lock;
 };

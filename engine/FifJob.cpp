@@ -126,14 +126,14 @@ MainWindow* FifJob::getMainWindow() const
     return manager ? manager->getMainWindow() : nullptr;
 }
 
+// Rows are inserted already holding their hits rather than as placeholders
+// filled by setData: one insertion per batch either way, without a
+// dataChanged per hit, which views would have to process for nothing.
 void FifJob::appendHit(const FifHit& hit)
 {
     if (!hit.isValid())
         return;
-    FifHitsModel* model = getHitsModel();
-    const int row = model->rowCount(QModelIndex());
-    model->insertRow(row, QModelIndex());
-    model->setData(model->index(row, 0), QVariant::fromValue(hit), Qt::EditRole);
+    getHitsModel()->appendValidHits(FifHitList{hit}, 1);
 }
 
 void FifJob::appendHits(const FifHitList& hits)
@@ -143,15 +143,7 @@ void FifJob::appendHits(const FifHitList& hits)
         count += hit.isValid() ? 1 : 0;
     if (count == 0)
         return;
-    FifHitsModel* model = getHitsModel();
-    int row = model->rowCount(QModelIndex());
-    model->insertRows(row, count, QModelIndex());
-    for (const FifHit& hit : hits) {
-        if (!hit.isValid())
-            continue;
-        model->setData(model->index(row, 0), QVariant::fromValue(hit), Qt::EditRole);
-        ++row;
-    }
+    getHitsModel()->appendValidHits(hits, count);
 }
 
 void FifJob::run()

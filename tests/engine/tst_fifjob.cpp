@@ -197,6 +197,30 @@ private slots:
         QCOMPARE(job->getLineHitCount(), 3);
     }
 
+    // Views told of new rows find the hits in them at once; appending sends
+    // no dataChanged for rows that were never shown empty.
+    void appendedRowsHoldTheirHitsWhenAnnounced()
+    {
+        FifManager manager;
+        FifJob* job = manager.getJob(0);
+        FifHitsModel* model = job->getHitsModel();
+        new QAbstractItemModelTester(model, QAbstractItemModelTester::FailureReportingMode::QtTest,
+                                     job);
+        QStringList seen;
+        connect(model, &QAbstractItemModel::rowsInserted, this,
+                [&](const QModelIndex&, int first, int last) {
+                    for (int row = first; row <= last; ++row)
+                        seen << model->data(model->index(row, 0), Qt::ToolTipRole).toString();
+                });
+        QSignalSpy changed(model, &QAbstractItemModel::dataChanged);
+        job->appendHit(FifHit("f", 1, "one", 0, 0, job));
+        job->appendHits(FifHitList{FifHit("f", 2, "two", 0, 0, job), FifHit(),
+                                   FifHit("f", 3, "three", 0, 0, job)});
+        QCOMPARE(seen, QStringList({"one", "two", "three"}));
+        QCOMPARE(changed.count(), 0);
+        QCOMPARE(model->data(model->index(2, 0), Qt::UserRole).value<FifHit>().line, 3);
+    }
+
     void canonicalPathUsesWorkingDirOfStart()
     {
         FifManager manager;
