@@ -47,5 +47,10 @@ typedef QList<FifHit> FifHitList;
 } // namespace Orba
 } // namespace Gui
 
+// A hit holds no pointer into itself, so lists of hits may grow by moving
+// their memory rather than copying hit by hit; with a million rows that keeps
+// the old and the new array from being resident together.
+Q_DECLARE_TYPEINFO(Gui::Orba::FifHit, Q_RELOCATABLE_TYPE);
+
 Q_DECLARE_METATYPE(Gui::Orba::FifHit)
 Q_DECLARE_METATYPE(Gui::Orba::FifHitList)
