@@ -20,6 +20,13 @@ int FifHitsModel::rowCount(const QModelIndex& parent) const
     return int(hits.size());
 }
 
+QModelIndex FifHitsModel::index(int row, int column, const QModelIndex& parent) const
+{
+    if (parent.isValid() || column != 0 || row < 0 || row >= rowsKept.loadAcquire())
+        return QModelIndex();
+    return createIndex(row, column);
+}
+
 QVariant FifHitsModel::data(const QModelIndex& index, int role) const
 {
     if (!index.isValid())
@@ -79,6 +86,7 @@ bool FifHitsModel::insertRows(int row, int count, const QModelIndex& /*parent*/)
     {
         QWriteLocker locker(&lock);
         hits.insert(row, count, FifHit());
+        rowsKept.storeRelease(int(hits.size()));
     }
     endInsertRows();
     return true;
@@ -96,6 +104,7 @@ void FifHitsModel::appendValidHits(const FifHitList& batch, int validCount)
             if (hit.isValid())
                 hits.append(hit);
         }
+        rowsKept.storeRelease(int(hits.size()));
     }
     endInsertRows();
 }
@@ -111,6 +120,7 @@ bool FifHitsModel::removeRows(int row, int count, const QModelIndex& /*parent*/)
     {
         QWriteLocker locker(&lock);
         hits.remove(row, last - row + 1);
+        rowsKept.storeRelease(int(hits.size()));
     }
     endRemoveRows();
     return true;

@@ -4,6 +4,7 @@
 #include "FifHit.h"
 
 #include <QAbstractListModel>
+#include <QAtomicInt>
 #include <QReadWriteLock>
 
 namespace Gui {
@@ -20,6 +21,9 @@ public:
     ~FifHitsModel() override;
 
     int rowCount(const QModelIndex& parent = QModelIndex()) const override;
+    // The same indexes as the base class gives, without a lock per call.
+    QModelIndex index(int row, int column = 0,
+                      const QModelIndex& parent = QModelIndex()) const override;
     // Display: "file (line): text"; tool and status tip: the line's text;
     // Qt::UserRole: the FifHit itself.
     QVariant data(const QModelIndex& index, int role) const override;
@@ -40,6 +44,10 @@ private:
 
     QList<FifHit> hits;
     mutable QReadWriteLock lock;
+    // The size of `hits`, written under the write lock. A view laying out a
+    // million rows asks for each row's index; reading this instead of taking
+    // the lock each time keeps that pass short.
+    QAtomicInt rowsKept;
 };
 
 } // namespace Orba
