@@ -670,7 +670,6 @@ private slots:
                 job->stop();
             }
         });
-        QSignalSpy searching(job, &FifJob::searching);
         {
             FifWorker worker(job);
             worker.searchFolders();
