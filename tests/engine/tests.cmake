@@ -1,10 +1,16 @@
-# Internal engine classes (not exported) are compiled into their tests.
-foreach(_fif_pair "tst_fifprefilter;FifPrefilter" "tst_fiftexttest;FifTextTest")
-  list(GET _fif_pair 0 _fif_test)
-  list(GET _fif_pair 1 _fif_class)
+# The worker, its line scanner and their helpers are internal to the library
+# (not exported), so their tests compile them in.
+set(_fif_engine_internals
+    ${PROJECT_SOURCE_DIR}/engine/FifWorker.cpp
+    ${PROJECT_SOURCE_DIR}/engine/FifWorker.h
+    ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.cpp
+    ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h
+    ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.cpp
+    ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.h
+    ${PROJECT_SOURCE_DIR}/engine/FifTextTest.cpp
+    ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h)
+foreach(_fif_test tst_fifworker tst_fiflinescanner tst_fifprefilter tst_fiftexttest)
   if(TARGET ${_fif_test})
-    target_sources(${_fif_test} PRIVATE
-        ${PROJECT_SOURCE_DIR}/engine/${_fif_class}.cpp
-        ${PROJECT_SOURCE_DIR}/engine/${_fif_class}.h)
+    target_sources(${_fif_test} PRIVATE ${_fif_engine_internals})
   endif()
 endforeach()
