@@ -8,8 +8,11 @@ set(_fif_engine_internals
     ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.cpp
     ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.h
     ${PROJECT_SOURCE_DIR}/engine/FifTextTest.cpp
-    ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h)
-foreach(_fif_test tst_fifworker tst_fiflinescanner tst_fifprefilter tst_fiftexttest)
+    ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h
+    ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.cpp
+    ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.h)
+foreach(_fif_test tst_fifworker tst_fiflinescanner tst_fifprefilter tst_fiftexttest
+                  tst_fiflinecounter)
   if(TARGET ${_fif_test})
     target_sources(${_fif_test} PRIVATE ${_fif_engine_internals})
   endif()
