@@ -11,7 +11,8 @@ namespace Gui {
 namespace Orba {
 
 FifFileDevice::FifFileDevice(const QString& filePath)
-    : path(QFile::encodeName(filePath))
+    : name(filePath)
+    , path(QFile::encodeName(filePath))
 {
 }
 

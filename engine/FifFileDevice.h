@@ -27,6 +27,7 @@ public:
     void close() override;
     bool isSequential() const override { return true; }
 
+    QString filePath() const { return name; }
     // The bytes read at open(), from the start of the file.
     const QByteArray& head() const { return first; }
     // Reads up to `size` bytes at `position` without moving the device's
@@ -40,6 +41,7 @@ protected:
     qint64 writeData(const char* data, qint64 maxSize) override;
 
 private:
+    QString name;
     QByteArray path;
     QByteArray first;
     int fd = -1;
