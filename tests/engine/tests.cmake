@@ -10,7 +10,9 @@ set(_fif_engine_internals
     ${PROJECT_SOURCE_DIR}/engine/FifTextTest.cpp
     ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h
     ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.cpp
-    ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.h)
+    ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.h
+    ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.cpp
+    ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.h)
 foreach(_fif_test tst_fifworker tst_fiflinescanner tst_fifprefilter tst_fiftexttest
                   tst_fiflinecounter)
   if(TARGET ${_fif_test})
