@@ -107,6 +107,12 @@ void FifHitsModel::appendValidHits(const FifHitList& batch, int validCount)
         rowsKept.storeRelease(int(hits.size()));
     }
     endInsertRows();
+    // Receivers learn of each hit written, as when placeholder rows are
+    // filled one by one; views waiting to lay out the new rows do nothing.
+    for (int i = row; i < row + validCount; ++i) {
+        const QModelIndex written = createIndex(i, 0);
+        emit dataChanged(written, written);
+    }
 }
 
 bool FifHitsModel::removeRows(int row, int count, const QModelIndex& /*parent*/)

@@ -39,7 +39,8 @@ public:
 private:
     friend class FifJob;
     // Appends the valid hits of `batch` in its order, announced to views as
-    // one insertion of rows that already hold their hits.
+    // one insertion of rows that already hold their hits, then a
+    // dataChanged for each row.
     void appendValidHits(const FifHitList& batch, int validCount);
 
     QList<FifHit> hits;

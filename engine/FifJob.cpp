@@ -127,8 +127,8 @@ MainWindow* FifJob::getMainWindow() const
 }
 
 // Rows are inserted already holding their hits rather than as placeholders
-// filled by setData: one insertion per batch either way, without a
-// dataChanged per hit, which views would have to process for nothing.
+// filled by setData: one insertion per batch and one dataChanged per hit
+// either way, without a lock and a variant per hit.
 void FifJob::appendHit(const FifHit& hit)
 {
     if (!hit.isValid())
