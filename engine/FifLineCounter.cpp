@@ -30,25 +30,37 @@ Scan scanBytes(const uchar* p, qint64 size)
 {
     Scan scan;
     qint64 i = 0;
-    bool lastWasCR = false;
 #ifdef __SSE2__
+    // Counts in byte lanes (each compare gives -1 per hit), summed before a
+    // lane can overflow.
     const __m128i nl = _mm_set1_epi8('\n');
     const __m128i cr = _mm_set1_epi8('\r');
-    unsigned high = 0;
-    for (; i + 16 <= size; i += 16) {
-        const __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i*>(p + i));
-        const unsigned nlBits = unsigned(_mm_movemask_epi8(_mm_cmpeq_epi8(x, nl)));
-        const unsigned crBits = unsigned(_mm_movemask_epi8(_mm_cmpeq_epi8(x, cr)));
-        high |= unsigned(_mm_movemask_epi8(x));
-        if (nlBits) {
-            scan.newlines += __builtin_popcount(nlBits);
-            const unsigned crBefore = (crBits << 1) | (lastWasCR ? 1u : 0u);
-            scan.crlf += __builtin_popcount(nlBits & crBefore);
+    const __m128i zero = _mm_setzero_si128();
+    __m128i high = zero;
+    while (i + 16 <= size) {
+        __m128i newlines = zero;
+        __m128i crlf = zero;
+        const qint64 stop = qMin<qint64>(size, i + 255 * 16);
+        for (; i + 16 <= stop; i += 16) {
+            const __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i*>(p + i));
+            const __m128i isNl = _mm_cmpeq_epi8(x, nl);
+            // The byte before each: the last of the previous 16, or none.
+            const __m128i before = i > 0
+                ? _mm_loadu_si128(reinterpret_cast<const __m128i*>(p + i - 1))
+                : _mm_slli_si128(x, 1);
+            const __m128i isCrlf = _mm_and_si128(isNl, _mm_cmpeq_epi8(before, cr));
+            newlines = _mm_sub_epi8(newlines, isNl);
+            crlf = _mm_sub_epi8(crlf, isCrlf);
+            high = _mm_or_si128(high, x);
         }
-        lastWasCR = (crBits >> 15) & 1;
+        const __m128i sumNl = _mm_sad_epu8(newlines, zero);
+        const __m128i sumCrlf = _mm_sad_epu8(crlf, zero);
+        scan.newlines += _mm_cvtsi128_si32(sumNl) + _mm_extract_epi16(sumNl, 4);
+        scan.crlf += _mm_cvtsi128_si32(sumCrlf) + _mm_extract_epi16(sumCrlf, 4);
     }
-    scan.ascii = high == 0;
+    scan.ascii = _mm_movemask_epi8(high) == 0;
 #endif
+    bool lastWasCR = i > 0 && p[i - 1] == '\r';
     for (; i < size; ++i) {
         const uchar c = p[i];
         if (c == '\n') {

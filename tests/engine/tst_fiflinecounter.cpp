@@ -85,6 +85,9 @@ private slots:
         QTest::newRow("non-characters") << QByteArray("\xEF\xBF\xBE\xEF\xB7\x90\xF4\x8F\xBF\xBF\n");
         QTest::newRow("broken at line end") << QByteArray("\xE2\x84\r\n\xF0\x9F\n\xC2\r\n");
         QTest::newRow("supplementary") << QByteArray("\xF0\x9F\x98\x80 x\n");
+        QTest::newRow("many lines") << QByteArray("ab\r\n").repeated(5000)
+                                           + QByteArray("\n").repeated(5000)
+                                           + QByteArray("x\r\r\n\xC3\xA9\n").repeated(999);
         QTest::newRow("crlf across 16 bytes") << QByteArray(15, 'x') + "\r\n" + QByteArray(14, 'y')
                                                      + "\r\n";
     }
