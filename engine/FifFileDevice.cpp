@@ -10,9 +10,10 @@
 namespace Gui {
 namespace Orba {
 
-FifFileDevice::FifFileDevice(const QString& filePath)
+FifFileDevice::FifFileDevice(const QString& filePath, QByteArray* headBuffer)
     : name(filePath)
     , path(QFile::encodeName(filePath))
+    , first(headBuffer ? headBuffer : &ownHead)
 {
 }
 
@@ -34,15 +35,15 @@ bool FifFileDevice::open(OpenMode mode)
     } while (fd < 0 && errno == EINTR);
     if (fd < 0)
         return false;
-    first.resize(headSize);
-    const qint64 got = readAt(first.data(), headSize, 0);
+    first->resize(headSize);
+    const qint64 got = readAt(first->data(), headSize, 0);
     if (got < 0) {
         ::close(fd);
         fd = -1;
-        first.clear();
+        first->resize(0);
         return false;
     }
-    first.truncate(got);
+    first->resize(got);
     position = 0;
     // Unbuffered: the scan reads large blocks itself; a buffer in between
     // would only copy them once more.
@@ -55,7 +56,7 @@ void FifFileDevice::close()
         ::close(fd);
         fd = -1;
     }
-    first.clear();
+    first->resize(0);  // keeps the capacity of a lent buffer
     if (isOpen())
         QIODevice::close();
 }
@@ -69,9 +70,9 @@ qint64 FifFileDevice::readAt(char* data, qint64 size, qint64 at) const
             continue;
         if (got < 0)
             return done > 0 ? done : -1;
-        if (got == 0)
-            break;
         done += got;
+        if (got == 0 || done < size)
+            break;  // a regular file read short only at its end
     }
     return done;
 }
@@ -81,13 +82,13 @@ qint64 FifFileDevice::readData(char* data, qint64 maxSize)
     if (fd < 0)
         return -1;
     qint64 done = 0;
-    if (position < first.size()) {
-        done = qMin<qint64>(maxSize, first.size() - position);
-        std::memcpy(data, first.constData() + position, size_t(done));
+    if (position < first->size()) {
+        done = qMin<qint64>(maxSize, first->size() - position);
+        std::memcpy(data, first->constData() + position, size_t(done));
         position += done;
     }
     // A head shorter than a full block was the whole file then.
-    if (done < maxSize && first.size() == headSize) {
+    if (done < maxSize && first->size() == headSize) {
         const qint64 got = readAt(data + done, maxSize - done, position);
         if (got < 0 && done == 0)
             return -1;

@@ -18,7 +18,10 @@ namespace Orba {
 class FifFileDevice : public QIODevice
 {
 public:
-    explicit FifFileDevice(const QString& path);
+    // `headBuffer`, when given, holds the first block: a caller that opens
+    // file after file lends the same buffer to each, sparing an allocation
+    // (and the allocator's returning the memory) per file.
+    explicit FifFileDevice(const QString& path, QByteArray* headBuffer = nullptr);
     ~FifFileDevice() override;
 
     // Opens read-only and reads the first block; false if the file cannot
@@ -29,9 +32,10 @@ public:
 
     QString filePath() const { return name; }
     // The bytes read at open(), from the start of the file.
-    const QByteArray& head() const { return first; }
+    const QByteArray& head() const { return *first; }
     // Reads up to `size` bytes at `position` without moving the device's
-    // position; -1 on an error.
+    // position; -1 on an error. Fewer bytes than asked for means that the
+    // end of the file was reached: the device is for regular files only.
     qint64 readAt(char* data, qint64 size, qint64 position) const;
 
     static constexpr qint64 headSize = 64 * 1024;
@@ -43,7 +47,8 @@ protected:
 private:
     QString name;
     QByteArray path;
-    QByteArray first;
+    QByteArray ownHead;
+    QByteArray* first;
     int fd = -1;
     qint64 position = 0;  // the next byte readData() delivers
 };
