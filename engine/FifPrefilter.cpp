@@ -250,14 +250,37 @@ const char* FifPrefilter::find(const char* begin, const char* end, Cursor& curso
 
 const char* FifPrefilter::findSpecial(const char* begin, const char* end) const
 {
-    const char* first = end;
-    for (const QByteArray& special : specials) {
-        const void* at = memmem(begin, size_t(end - begin), special.constData(),
-                                size_t(special.size()));
-        if (at && static_cast<const char*>(at) < first)
-            first = static_cast<const char*>(at);
+    // Looks for the lead bytes of the specials, 16 bytes at a time, and
+    // compares the sequences only where one is found.
+    auto specialAt = [&](const char* at) {
+        for (const QByteArray& special : specials) {
+            if (end - at >= special.size()
+                && std::memcmp(at, special.constData(), size_t(special.size())) == 0)
+                return true;
+        }
+        return false;
+    };
+    const char* at = begin;
+#ifdef __SSE2__
+    const __m128i leadA = _mm_set1_epi8(specials.first().at(0));
+    const __m128i leadB = _mm_set1_epi8(specials.last().at(0));
+    for (; at + 16 <= end; at += 16) {
+        const __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i*>(at));
+        unsigned bits = unsigned(_mm_movemask_epi8(
+            _mm_or_si128(_mm_cmpeq_epi8(x, leadA), _mm_cmpeq_epi8(x, leadB))));
+        while (bits) {
+            const int bit = __builtin_ctz(bits);
+            if (specialAt(at + bit))
+                return at + bit;
+            bits &= bits - 1;
+        }
     }
-    return first;
+#endif
+    for (; at < end; ++at) {
+        if (specialAt(at))
+            return at;
+    }
+    return end;
 }
 
 const char* FifPrefilter::findNeedle(const char* begin, const char* end) const

@@ -324,6 +324,27 @@ private slots:
                  bytes.constData());
     }
 
+    // The Kelvin sign and the long s are found at every place, also cut off
+    // at the end of the range.
+    void findsSpecialsAtEveryPlace()
+    {
+        const FifPrefilter prefilter(expression("sk", QRegExp::FixedString, Qt::CaseInsensitive));
+        for (const QByteArray& special : {QByteArray("\xE2\x84\xAA"), QByteArray("\xC5\xBF")}) {
+            for (int size = 0; size < 40; ++size) {
+                for (int at = 0; at < size; ++at) {
+                    QByteArray bytes(size, 'a');
+                    bytes.replace(at, special.size(), special);
+                    bytes.truncate(size);
+                    const bool whole = at + special.size() <= size;
+                    FifPrefilter::Cursor cursor;
+                    const char* begin = bytes.constData();
+                    QCOMPARE(prefilter.find(begin, begin + size, cursor) - begin,
+                             whole ? at : size);
+                }
+            }
+        }
+    }
+
     // The vector loop and the byte loop meet at every length and alignment.
     void findsAtEveryPlace()
     {
