@@ -68,6 +68,7 @@ class tst_FifGrep : public QObject
 private:
     QString program;
     QStringList folders;
+    QTemporaryDir extra;
 
 private slots:
     void initTestCase()
@@ -84,6 +85,20 @@ private slots:
         }
         if (folders.isEmpty())
             QSKIP("no system headers to compare on");
+        // A small tree of our own makes sure that the explained differences
+        // do come up: a file with a control character in its first lines,
+        // and a link to a text file.
+        QVERIFY(extra.isValid());
+        QFile control(extra.path() + "/control.h");
+        QVERIFY(control.open(QIODevice::WriteOnly));
+        control.write("\x01 not text\nQString s;\n");
+        control.close();
+        QFile text(extra.path() + "/text.h");
+        QVERIFY(text.open(QIODevice::WriteOnly));
+        text.write("QString t;\n");
+        text.close();
+        QVERIFY(QFile::link(extra.path() + "/text.h", extra.path() + "/link.h"));
+        folders.append(extra.path());
     }
 
     void sameHitsAsGrep_data()
@@ -176,6 +191,11 @@ private slots:
             explained.append(file);
         if (!explained.isEmpty())
             qInfo() << "not text to fif, so not searched:" << explained;
+        if (pattern == "QString") {
+            QVERIFY(notText.contains(extra.path() + "/control.h"));
+            QVERIFY(fifHits.contains(keyOf({extra.path() + "/text.h", 1, "QString t;"})));
+            QVERIFY(!fifHits.contains(keyOf({extra.path() + "/link.h", 1, "QString t;"})));
+        }
 
         // Links are passed over by both: grep -r follows none inside the
         // tree, fif lists none.
