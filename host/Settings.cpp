@@ -15,13 +15,11 @@ namespace {
 // is read back.
 const QString typeGroup = QStringLiteral("ValueTypes");
 
-// QSettings folds "a\\b", "a//b" and "/a/b/" into "a/b"; the type entry
-// must follow the same key as the value.
+// QSettings folds "a//b" and "/a/b/" into "a/b"; the type entry must
+// follow the same key as the value.
 QString normalized(const QString& keyPath)
 {
-    QString path = keyPath;
-    path.replace(QLatin1Char('\\'), QLatin1Char('/'));
-    return path.split(QLatin1Char('/'), Qt::SkipEmptyParts).join(QLatin1Char('/'));
+    return keyPath.split(QLatin1Char('/'), Qt::SkipEmptyParts).join(QLatin1Char('/'));
 }
 
 // One key below typeGroup per value: "%" and "/" are escaped so that
