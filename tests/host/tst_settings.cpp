@@ -147,6 +147,7 @@ private slots:
 
     void damagedFile_data()
     {
+        static const char garbage[] = "\x00\x01\x02\xff\xfe\n[[[\n=\n\x7f";
         QTest::addColumn<QByteArray>("bytes");
         QTest::addColumn<QString>("salvagedKey");
         QTest::addColumn<QVariant>("salvagedValue");
@@ -156,7 +157,7 @@ private slots:
         QTest::newRow("line without value")
             << QByteArray("[ok]\nkeep=yes\n[a]\nno value here\n") << "ok/keep" << QVariant("yes");
         QTest::newRow("binary garbage")
-            << QByteArray("\x00\x01\x02\xff\xfe\n[[[\n=\n\x7f", 16) << QString() << QVariant();
+            << QByteArray(garbage, sizeof(garbage) - 1) << QString() << QVariant();
     }
 
     void damagedFile()
