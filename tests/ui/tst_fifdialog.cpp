@@ -106,7 +106,12 @@ std::function<void(QWidget*)> choose(const QString& folder)
             pressOk(modal);
             return;
         }
-        chooser->selectFile(folder);
+        // With nothing typed or selected, a folder chooser answers the folder
+        // it shows; selecting an entry instead races with the chooser's own
+        // asynchronous listing of the folder's contents.
+        chooser->setDirectory(folder);
+        if (auto edit = chooser->findChild<QLineEdit*>("fileNameEdit"))
+            edit->clear();
         static_cast<QDialog*>(chooser)->accept();
     };
 }
