@@ -122,7 +122,7 @@
 <context>
     <name>Gui::Orba::FifDialog</name>
     <message>
-        <location filename="../ui/FifDialog.cpp" line="+154"/>
+        <location filename="../ui/FifDialog.cpp" line="+157"/>
         <source>Empty Expression</source>
         <translation type="unfinished"></translation>
     </message>

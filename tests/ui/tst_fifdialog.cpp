@@ -4,6 +4,7 @@
 #include "FifJob.h"
 #include "FifManager.h"
 #include "FifSettings.h"
+#include "ImageManager.h"
 #include "Settings.h"
 #include "TestTree.h"
 
@@ -231,6 +232,8 @@ private slots:
         QCOMPARE(dialog.getHelpTopic(), QString("find-in-files-dialog"));
         QCOMPARE(dialog.getSettings(), &settings);
         QVERIFY(!dialog.getJob());
+        const QIcon icon = ImageManager::getInstance()->getIcon("gui-orba-find-in-files");
+        QCOMPARE(dialog.windowIcon().isNull(), icon.isNull());
         QVERIFY(c.where->completer());
         QCOMPARE(c.where->completer()->caseSensitivity(), Qt::CaseInsensitive);
         QVERIFY(c.start->isEnabled());
