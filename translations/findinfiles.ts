@@ -158,7 +158,7 @@
 <context>
     <name>QObject</name>
     <message>
-        <location filename="../engine/FifInput.cpp" line="+91"/>
+        <location filename="../engine/FifInput.cpp" line="+116"/>
         <source>Find regular expression &quot;%1&quot;</source>
         <translation type="unfinished"></translation>
     </message>

@@ -233,7 +233,8 @@ private slots:
         QCOMPARE(dialog.getSettings(), &settings);
         QVERIFY(!dialog.getJob());
         const QIcon icon = ImageManager::getInstance()->getIcon("gui-orba-find-in-files");
-        QCOMPARE(dialog.windowIcon().isNull(), icon.isNull());
+        QVERIFY(!icon.isNull());
+        QCOMPARE(dialog.windowIcon().pixmap(16, 16).toImage(), icon.pixmap(16, 16).toImage());
         QVERIFY(c.where->completer());
         QCOMPARE(c.where->completer()->caseSensitivity(), Qt::CaseInsensitive);
         QVERIFY(c.start->isEnabled());
