@@ -36,7 +36,10 @@ FifCommandLine::Result FifCommandLine::parse(const QStringList& arguments)
         tr("Folders to search (default: the current directory). Put -- before a pattern "
            "or folder that begins with a dash."),
         QStringLiteral("[FOLDER...]"));
+    // Qt names the program by the path it was started with.
     helpText = parser.helpText();
+    if (!arguments.isEmpty())
+        helpText.replace(QStringLiteral("Usage: ") + arguments.first(), QStringLiteral("Usage: fif"));
 
     if (!parser.parse(arguments)) {
         errorText = parser.errorText();

@@ -149,8 +149,9 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
         if (matchLine(decodeUtf8(decoder, line.constData(), line.size()), terminator,
                       skippedChars, sink))
             hasHit = true;
-        line.clear();
-        tail.clear();
+        // Keep the buffers' memory for the next line.
+        line.resize(0);
+        tail.resize(0);
         overlong = false;
         skippedChars = 0;
         endsWithCR = false;

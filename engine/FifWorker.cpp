@@ -93,7 +93,7 @@ bool FifWorker::isTextFile(const QFileInfo& info)
     QTextStream stream(&file);
     int lines = 0;
     while (!stream.atEnd()) {
-        const QString piece = stream.read(64 * 1024);
+        const QString piece = stream.read(4096);
         if (piece.isEmpty())
             break;
         for (const QChar c : piece) {

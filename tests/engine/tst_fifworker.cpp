@@ -82,6 +82,8 @@ private:
     void prepare(FifManager& manager, const FifInput& request, FifJob*& job)
     {
         job = manager.getJob(0);
+        new QAbstractItemModelTester(job->getHitsModel(),
+                                     QAbstractItemModelTester::FailureReportingMode::QtTest, job);
         job->stop();
         FIF_RUN_JOB(job, request, 10000);
         QCOMPARE(job->getReadFileCount(), 0);
@@ -616,8 +618,6 @@ private slots:
         FifJob* job = nullptr;
         prepare(manager, makeRequest("needle", base), job);
         FifHitsModel* model = job->getHitsModel();
-        new QAbstractItemModelTester(model, QAbstractItemModelTester::FailureReportingMode::QtTest,
-                                     job);
         for (int i = 0; i < 8; ++i)
             job->appendHit(FifHit("earlier", i, "earlier", 0, 0, job));
         // The worker runs in this thread, so its hits reach the model at
