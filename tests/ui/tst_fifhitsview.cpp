@@ -189,6 +189,7 @@ private slots:
     void sameJobTwice();
     void replacedJob();
     void staleEndOfReplacedJob();
+    void jobDeletedUnderView();
     void modelUnderTesterWhileStreaming();
     void wrapPrompts_data();
     void wrapPrompts();
@@ -728,6 +729,33 @@ void tst_FifHitsView::staleEndOfReplacedJob()
     QVERIFY(watcher.wait());
     QCOMPARE(view.getStatusLabel()->text(), QString());
     QVERIFY(!chaseActionOf(view)->isVisible());
+}
+
+void tst_FifHitsView::jobDeletedUnderView()
+{
+    makeTree(20, 2);
+    FifManager manager;
+    auto* job = new FifJob(&manager);
+    FifHitsView view(job, nullptr);
+    view.show();
+    QVERIFY(QTest::qWaitForWindowExposed(&view));
+    QAction sharedStop;
+    view.linkStopAction(&sharedStop);
+    QVERIFY(job->start(request()));
+    QVERIFY(chaseActionOf(view)->isVisible());
+    delete job; // stops the search and waits for its thread
+
+    QVERIFY(!view.getJob());
+    QVERIFY(!view.findChild<QTreeView*>()->model());
+    QVERIFY(!chaseActionOf(view)->isVisible());
+    QVERIFY(!sharedStop.isEnabled());
+    // Whatever was still queued, and every command, finds no job.
+    QTest::qWait(50);
+    sharedStop.trigger();
+    actionOf(&view, "clear-fifresults")->trigger();
+    view.next();
+    view.onFifAction();
+    QVERIFY(!view.getJob());
 }
 
 void tst_FifHitsView::modelUnderTesterWhileStreaming()
