@@ -176,6 +176,7 @@ private slots:
     void constructionTable_data();
     void constructionTable();
     void widgetTree();
+    void metaObjectInterface();
     void stateTable_data();
     void stateTable();
     void finalStatus_data();
@@ -356,6 +357,22 @@ void tst_FifHitsView::widgetTree()
     FifHitsView empty(nullptr, nullptr);
     QVERIFY(!empty.getJob());
     QVERIFY(!empty.findChild<QTreeView*>()->model());
+}
+
+void tst_FifHitsView::metaObjectInterface()
+{
+    // The host connects by these signatures.
+    const QMetaObject& meta = FifHitsView::staticMetaObject;
+    QCOMPARE(meta.className(), "Gui::Orba::FifHitsView");
+    QStringList signatures;
+    for (int i = meta.methodOffset(); i < meta.methodCount(); ++i)
+        signatures << QString::fromLatin1(meta.method(i).methodSignature());
+    QCOMPARE(signatures, QStringList({"showHit(Gui::Orba::FifHit)", "next()", "previous()",
+                                      "setIconSize(QSize)", "onFifAction()", "onAboutToStart()",
+                                      "onEnded()", "onSearching(QString)", "updateActions()",
+                                      "showCurrentIndex()", "showIndex(QModelIndex)", "saveAs()",
+                                      "removeAllRows()"}));
+    QCOMPARE(meta.method(meta.methodOffset()).methodType(), QMetaMethod::Signal);
 }
 
 void tst_FifHitsView::stateTable_data()
