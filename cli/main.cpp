@@ -14,9 +14,13 @@
 #include <QCoreApplication>
 #include <QObject>
 
+#include <cerrno>
 #include <csignal>
 #include <cstdio>
 #include <cstring>
+
+#include <fcntl.h>
+#include <unistd.h>
 
 using namespace Gui::Orba;
 
@@ -64,6 +68,22 @@ bool checkExpression(const FifInput& request)
 
 int main(int argc, char* argv[])
 {
+    // A standard descriptor that was closed before the start would be
+    // handed to the next file or event descriptor Qt opens, and hits would
+    // be written into it; /dev/null takes its place first.
+    bool outputClosed = false;
+    for (int fd = STDIN_FILENO; fd <= STDERR_FILENO; ++fd) {
+        if (fcntl(fd, F_GETFD) == -1 && errno == EBADF) {
+            outputClosed = outputClosed || fd == STDOUT_FILENO;
+            if (open("/dev/null", fd == STDIN_FILENO ? O_RDONLY : O_WRONLY) != fd)
+                return 2;
+        }
+    }
+    if (outputClosed) {
+        std::fputs("fif: standard output is closed\n", stderr);
+        return 2;
+    }
+
     // A reader that goes away (fif ... | head) shows as EPIPE on the next
     // write, which stops the search; the default would kill the process.
     std::signal(SIGPIPE, SIG_IGN);

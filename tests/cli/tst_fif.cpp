@@ -247,6 +247,19 @@ private slots:
         QVERIFY2(match.hasMatch(), qPrintable(err));
         QVERIFY(match.captured(1).toInt() < 100 * 1000);
     }
+
+    // Started with standard output closed, fif writes into no descriptor
+    // that happens to take its number, and says so.
+    void closedOutputAtStart()
+    {
+        if (QStandardPaths::findExecutable("bash").isEmpty())
+            QSKIP("bash is needed to close a descriptor");
+        QProcess shell;
+        shell.start("bash", {"-c", "\"$0\" needle \"$1\" >&-", program, root + "/src"});
+        QVERIFY(shell.waitForFinished(60000));
+        QCOMPARE(shell.exitCode(), 2);
+        QCOMPARE(shell.readAllStandardError(), QByteArray("fif: standard output is closed\n"));
+    }
 };
 
 QTEST_GUILESS_MAIN(tst_Fif)
