@@ -1,5 +1,7 @@
 #include "FifLineScanner.h"
 
+#include "FifLineCounter.h"
+
 #include <QIODevice>
 #include <QStringDecoder>
 
@@ -69,6 +71,8 @@ qint64 utf8Length(QStringDecoder& decoder, const char* bytes, qsizetype size)
 
 FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint64 block)
     : rx(expression)
+    , prefilter(expression)
+    , usePrefilter(prefilter.isActive())
     , maxLineBytes(qMax<qint64>(maxBytes, 1))
     , blockSize(qMax<qint64>(block, 1))
 {
@@ -76,6 +80,9 @@ FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint6
 
 bool FifLineScanner::scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop)
 {
+    lineNumber = 1;
+    offset = 0;
+    rawOffset = 0;
     // The same byte-order-mark detection as QTextStream's, so that the text
     // test and the scan read a file alike.
     const auto encoding = QStringConverter::encodingForData(device.peek(4));
@@ -134,6 +141,32 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
 
     auto stopRequested = [&] { return shouldStop && shouldStop(); };
 
+    // Whole lines that cannot match are not decoded; the counters pass over
+    // them as matching them would have. Those after the last candidate of a
+    // block are counted only once a later line needs the counts, so not at
+    // all when the file ends first.
+    const char* uncountedFrom = nullptr;
+    const char* uncountedTo = nullptr;
+    // Returns whether a line numbered by a multiple of pollInterval, where
+    // the stop flag is read, was passed over.
+    auto passOver = [&](const char* begin, const char* end) {
+        if (begin >= end)
+            return false;
+        const FifLineCounter::Counts counts = FifLineCounter::count(begin, end, decoder);
+        const bool pollDue = lineNumber % pollInterval == 0
+                             || (lineNumber + counts.lines - 1) / pollInterval
+                                    != (lineNumber - 1) / pollInterval;
+        lineNumber += counts.lines;
+        offset += counts.chars + counts.lines;
+        rawOffset += counts.chars + counts.lines + counts.crlfLines;
+        return pollDue;
+    };
+    auto settle = [&] {
+        const bool pollDue = passOver(uncountedFrom, uncountedTo);
+        uncountedFrom = uncountedTo = nullptr;
+        return pollDue;
+    };
+
     auto finishLine = [&](bool hasNewline) {
         int terminator = hasNewline ? 1 : 0;
         if (hasNewline && endsWithCR) {
@@ -144,11 +177,27 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
             else
                 line.chop(1);
         }
-        if (!tail.isEmpty())
-            skippedChars += utf8Length(decoder, tail.constData(), tail.size());
-        if (matchLine(decodeUtf8(decoder, line.constData(), line.size()), terminator,
-                      skippedChars, sink))
-            hasHit = true;
+        FifPrefilter::Cursor cursor;
+        const char* lineEnd = line.constData() + line.size();
+        if (usePrefilter && !overlong
+            && prefilter.find(line.constData(), lineEnd, cursor) == lineEnd) {
+            // Cannot match. Only a line after it needs its length.
+            if (hasNewline) {
+                settle();
+                const qint64 length =
+                    FifLineCounter::utf16Length(line.constData(), line.size(), decoder);
+                offset += length + 1;
+                rawOffset += length + terminator;
+                ++lineNumber;
+            }
+        } else {
+            settle();
+            if (!tail.isEmpty())
+                skippedChars += utf8Length(decoder, tail.constData(), tail.size());
+            if (matchLine(decodeUtf8(decoder, line.constData(), line.size()), terminator,
+                          skippedChars, sink))
+                hasHit = true;
+        }
         // Keep the buffers' memory for the next line.
         line.resize(0);
         tail.resize(0);
@@ -189,23 +238,73 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
         }
     };
 
+    auto pending = [&] { return !line.isEmpty() || overlong; };
+
+    // Matches the whole lines of [begin, end), each ended by "\n"; false
+    // when a stop was requested. With a prefilter only the lines it points
+    // at are decoded and matched.
+    auto scanLines = [&](const char* begin, const char* end) {
+        if (!usePrefilter) {
+            while (begin < end) {
+                const char* newline =
+                    static_cast<const char*>(std::memchr(begin, '\n', size_t(end - begin)));
+                if (lineNumber % pollInterval == 0 && stopRequested())
+                    return false;
+                addToLine(begin, newline - begin);
+                finishLine(true);
+                begin = newline + 1;
+            }
+            return true;
+        }
+        FifPrefilter::Cursor cursor;
+        while (begin < end) {
+            const char* candidate = prefilter.find(begin, end, cursor);
+            if (candidate == end)
+                break;
+            const char* lineStart = static_cast<const char*>(
+                memrchr(begin, '\n', size_t(candidate - begin)));
+            lineStart = lineStart ? lineStart + 1 : begin;
+            const char* newline = static_cast<const char*>(
+                std::memchr(candidate, '\n', size_t(end - candidate)));
+            bool pollDue = settle();
+            pollDue = passOver(begin, lineStart) || pollDue;
+            if ((pollDue || lineNumber % pollInterval == 0) && stopRequested())
+                return false;
+            addToLine(lineStart, newline - lineStart);
+            finishLine(true);
+            begin = newline + 1;
+        }
+        uncountedFrom = begin;
+        uncountedTo = end;
+        return true;
+    };
+
     bool firstBlock = true;
+    int current = 0;
     while (true) {
         // A single line may span many blocks; a stop must not wait for its end.
         if (!firstBlock && stopRequested())
             return hasHit;
         firstBlock = false;
-        const QByteArray block = device.read(blockSize);
-        if (block.isEmpty())
+        // Read into the buffer not holding uncounted lines.
+        QByteArray& buffer = buffers[current];
+        current = 1 - current;
+        if (buffer.size() != blockSize)
+            buffer.resize(blockSize);
+        const qint64 got = device.read(buffer.data(), blockSize);
+        if (settle() && stopRequested())
+            return hasHit;
+        if (got <= 0)
             break;
-        const char* data = block.constData();
-        const char* end = data + block.size();
-        while (data < end) {
+        const char* data = buffer.constData();
+        const char* end = data + got;
+        // The end of a line begun in an earlier block.
+        if (pending()) {
             const char* newline =
                 static_cast<const char*>(std::memchr(data, '\n', size_t(end - data)));
             if (!newline) {
                 addToLine(data, end - data);
-                break;
+                continue;
             }
             if (lineNumber % pollInterval == 0 && stopRequested())
                 return hasHit;
@@ -213,8 +312,14 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
             finishLine(true);
             data = newline + 1;
         }
+        const char* lastNewline =
+            static_cast<const char*>(memrchr(data, '\n', size_t(end - data)));
+        const char* whole = lastNewline ? lastNewline + 1 : data;
+        if (!scanLines(data, whole))
+            return hasHit;
+        addToLine(whole, end - whole);
     }
-    if (!line.isEmpty() || overlong) {
+    if (pending()) {
         if (lineNumber % pollInterval == 0 && stopRequested())
             return hasHit;
         finishLine(false);

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "FifPrefilter.h"
+
 #include <QString>
 #include <QStringConverter>
 #include <QtCore5Compat/QRegExp>
@@ -50,6 +52,12 @@ public:
     // Returns whether any line matched.
     bool scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
 
+    // Whether UTF-8 lines that cannot match are passed over undecoded (the
+    // default whenever the expression allows it). Off, every line is
+    // decoded and matched: the results are the same, only slower.
+    void setPrefilterEnabled(bool enabled) { usePrefilter = enabled && prefilter.isActive(); }
+    bool isPrefilterEnabled() const { return usePrefilter; }
+
 private:
     bool scanUtf8(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
     bool scanDecoded(QIODevice& device, QStringConverter::Encoding encoding, int unitBytes,
@@ -60,8 +68,12 @@ private:
                    const MatchSink& sink);
 
     QRegExp rx;
+    FifPrefilter prefilter;
+    bool usePrefilter;
     qint64 maxLineBytes;
     qint64 blockSize;
+    // Two, so that a block passed over can be counted after the next read.
+    QByteArray buffers[2];
     qint64 lineNumber = 1;
     qint64 offset = 0;
     qint64 rawOffset = 0;

@@ -1,7 +1,9 @@
 #include "FifWorker.h"
 
+#include "FifFileDevice.h"
 #include "FifJob.h"
 #include "FifLineScanner.h"
+#include "FifTextTest.h"
 
 #include <QFile>
 #include <QFileInfo>
@@ -13,9 +15,11 @@ namespace Orba {
 FifWorker::FifWorker(FifJob* owner)
     : job(owner)
 {
+    if (job)
+        input = job->getInput();
+    scanner = std::make_unique<FifLineScanner>(input.getRegExp());
     if (!job)
         return;
-    input = job->getInput();
     connect(this, &FifWorker::searching, job, &FifJob::searching);
     connect(this, qOverload<const FifHit&>(&FifWorker::found), job, &FifJob::appendHit);
     connect(this, qOverload<const FifHitList&>(&FifWorker::found), job, &FifJob::appendHits);
@@ -23,6 +27,7 @@ FifWorker::FifWorker(FifJob* owner)
 
 FifWorker::~FifWorker()
 {
+    openedFile.reset();
     if (job)
         job->setShouldStop(false);
 }
@@ -69,8 +74,9 @@ void FifWorker::searchFolder(const QDir& folder)
     for (const QFileInfo& entry : entries) {
         if (job && job->shouldStop())
             return;
-        if (isTextFile(entry))
+        if (openTextFile(entry))
             searchFile(entry.filePath());
+        openedFile.reset();
         if (input.includeSubFolders && entry.isDir()) {
             QDir subFolder = folder;
             subFolder.setPath(entry.filePath());
@@ -82,9 +88,54 @@ void FifWorker::searchFolder(const QDir& folder)
 
 bool FifWorker::isTextFile(const QFileInfo& info)
 {
-    if (!info.isFile() || !info.isReadable())
+    if (!info.isFile())
         return false;
-    QFile file(info.filePath());
+    // A file that cannot be read cannot be opened either: open() answers
+    // for isReadable() without a call of its own.
+    FifFileDevice file(info.filePath());
+    return file.open(QIODevice::ReadOnly) && isTextFile(file);
+}
+
+bool FifWorker::openTextFile(const QFileInfo& info)
+{
+    openedFile.reset();
+    if (!info.isFile())
+        return false;
+    auto file = std::make_unique<FifFileDevice>(info.filePath(), &headBuffer);
+    if (!file->open(QIODevice::ReadOnly) || !isTextFile(*file))
+        return false;
+    openedPath = info.filePath();
+    openedFile = std::move(file);
+    return true;
+}
+
+bool FifWorker::isTextFile(FifFileDevice& file)
+{
+    // The bytes themselves tell what decoding them through a QTextStream
+    // would; only files of a UTF-16 or UTF-32 byte-order mark need decoding.
+    FifTextTest test;
+    const QByteArray& head = file.head();
+    FifTextTest::Verdict verdict = test.feed(head.constData(), head.size());
+    if (verdict == FifTextTest::Undecided && head.size() == FifFileDevice::headSize) {
+        QByteArray more(256 * 1024, Qt::Uninitialized);
+        qint64 position = head.size();
+        while (verdict == FifTextTest::Undecided) {
+            const qint64 got = file.readAt(more.data(), more.size(), position);
+            if (got <= 0)
+                break;
+            position += got;
+            verdict = test.feed(more.constData(), got);
+        }
+    }
+    verdict = test.finish();
+    if (verdict == FifTextTest::OtherEncoding)
+        return isTextByStream(file.filePath());
+    return verdict == FifTextTest::Text;
+}
+
+bool FifWorker::isTextByStream(const QString& path)
+{
+    QFile file(path);
     if (!file.open(QIODevice::ReadOnly))
         return false;
     // Read in pieces rather than by readLine(), so that one huge first line
@@ -110,17 +161,22 @@ bool FifWorker::isTextFile(const QFileInfo& info)
 
 void FifWorker::searchFile(const QString& path)
 {
-    QFile file(path);
-    if (!file.open(QIODevice::ReadOnly))
-        return;
+    std::unique_ptr<FifFileDevice> file;
+    if (openedFile && openedPath == path) {
+        file = std::move(openedFile);
+    } else {
+        openedFile.reset();  // it may hold the head buffer
+        file = std::make_unique<FifFileDevice>(path, &headBuffer);
+        if (!file->open(QIODevice::ReadOnly))
+            return;
+    }
     if (job)
         job->incrementReadFileCount();
     emit searching(path);
 
-    FifLineScanner scanner(input.getRegExp());
     FifHitList batch;
-    const bool hasHit = scanner.scan(
-        file,
+    const bool hasHit = scanner->scan(
+        *file,
         [&](const FifLineScanner::Match& match) {
             sendHit(FifHit(path, match.line, match.text, match.offset, match.rawOffset, job),
                     batch);

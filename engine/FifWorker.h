@@ -7,12 +7,16 @@
 #include <QList>
 #include <QObject>
 
+#include <memory>
+
 class QFileInfo;
 
 namespace Gui {
 namespace Orba {
 
+class FifFileDevice;
 class FifJob;
+class FifLineScanner;
 
 // Walks the folders of a job's request depth-first and scans every text file
 // in it. Lives on the job's thread for one run; reaches the job only through
@@ -44,9 +48,21 @@ protected:
 private:
     void addFolder(QDir& folder, QList<QDir>& folders);
     void sendHit(const FifHit& hit, FifHitList& batch);
+    // Opens the entry and tests it; a text file stays open for the
+    // searchFile() that follows, so that it is opened only once.
+    bool openTextFile(const QFileInfo& info);
+    static bool isTextFile(FifFileDevice& file);
+    // The test through a QTextStream, for files of a UTF-16 or UTF-32
+    // byte-order mark.
+    static bool isTextByStream(const QString& path);
 
     FifJob* job;
     FifInput input;
+    // Built once for the whole search.
+    std::unique_ptr<FifLineScanner> scanner;
+    std::unique_ptr<FifFileDevice> openedFile;
+    QString openedPath;
+    QByteArray headBuffer;  // lent to each file opened in turn
 };
 
 } // namespace Orba

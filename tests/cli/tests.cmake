@@ -17,5 +17,13 @@ if(TARGET tst_fifgrep)
       ${PROJECT_SOURCE_DIR}/engine/FifWorker.cpp
       ${PROJECT_SOURCE_DIR}/engine/FifWorker.h
       ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.cpp
-      ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h)
+      ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h
+      ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.cpp
+      ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.h
+      ${PROJECT_SOURCE_DIR}/engine/FifTextTest.cpp
+      ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h
+      ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.cpp
+      ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.h
+      ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.cpp
+      ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.h)
 endif()

@@ -374,6 +374,67 @@ private slots:
         QVERIFY(results.isEmpty());
         QCOMPARE(polls, 3);
     }
+
+    // Lines that cannot match are passed over undecoded: every hit, line
+    // number, offset and text stays what matching every line gives, also
+    // with over-long lines, lines split between reads, CRLF, byte-order
+    // marks, broken UTF-8 and the characters QRegExp folds to ASCII.
+    void prefilterChangesNothing()
+    {
+        const QList<QByteArray> pieces = {
+            "int", "k", "S", "x", " ", "\n", "\n", "\n", "\r\n", "\r", "\t",
+            "\xE2\x84\xAA", "\xC5\xBF", "\xC3\xA9", "\xF0\x9F\x98\x80", "\xEF\xBB\xBF",
+            "\xE2\x84", "\xFF", "\x80", "\xEF\xBF\xBE", QByteArray("\0", 1),
+            QByteArray(40, 'y'), "Kit", "sInT"};
+        struct Request
+        {
+            QString what;
+            QRegExp::PatternSyntax syntax;
+        };
+        const QList<Request> requests = {
+            {"int", QRegExp::FixedString}, {"kit", QRegExp::FixedString},
+            {"s", QRegExp::FixedString},   {"x y", QRegExp::FixedString},
+            {"k.*t", QRegExp::RegExp2},    {"\\bint\\b", QRegExp::RegExp2},
+            {"^x", QRegExp::RegExp2}};
+        QRandomGenerator random(31337);
+        int withPrefilter = 0;
+        for (int round = 0; round < 400; ++round) {
+            QByteArray bytes = round % 5 == 0 ? QByteArray("\xEF\xBB\xBF") : QByteArray();
+            const int count = int(random.bounded(0, 120));
+            for (int i = 0; i < count; ++i)
+                bytes += pieces.at(int(random.bounded(pieces.size())));
+            const qint64 maxLine = QList<qint64>{3, 8, 50, FifLineScanner::defaultMaxLineBytes}
+                                       .at(int(random.bounded(4)));
+            const qint64 block = QList<qint64>{1, 7, 64, FifLineScanner::defaultBlockSize}
+                                     .at(int(random.bounded(4)));
+            for (const Request& request : requests) {
+                for (Qt::CaseSensitivity cs : {Qt::CaseSensitive, Qt::CaseInsensitive}) {
+                    const QRegExp rx(request.what, cs, request.syntax);
+                    QList<Result> results[2];
+                    bool hits[2] = {false, false};
+                    for (int plain = 0; plain < 2; ++plain) {
+                        QBuffer buffer;
+                        buffer.setData(bytes);
+                        buffer.open(QIODevice::ReadOnly);
+                        FifLineScanner scanner(rx, maxLine, block);
+                        if (plain)
+                            scanner.setPrefilterEnabled(false);
+                        else
+                            withPrefilter += scanner.isPrefilterEnabled() ? 1 : 0;
+                        hits[plain] = scanner.scan(
+                            buffer,
+                            [&](const FifLineScanner::Match& m) {
+                                results[plain].append({m.line, m.offset, m.rawOffset, m.text});
+                            },
+                            {});
+                    }
+                    QCOMPARE(results[0], results[1]);
+                    QCOMPARE(hits[0], hits[1]);
+                }
+            }
+        }
+        QVERIFY(withPrefilter > 1000);
+    }
 };
 
 QTEST_GUILESS_MAIN(tst_FifLineScanner)
