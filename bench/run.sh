@@ -36,7 +36,7 @@ trap 'rm -rf "$work"' EXIT
 hits_of() { # name, command: (file:line) pairs, sorted
   case "$1" in
     fif) eval "$2" 2>/dev/null | perl -ne 'print "$1:$2\n" if /^(.*?) \((\d+)\): /' ;;
-    *) eval "$2 --null" | perl -ne 'print "$1:$2\n" if /^(.*?)\0(\d+):/' ;;
+    *) eval "$2 --null" 2>/dev/null | perl -ne 'print "$1:$2\n" if /^(.*?)\0(\d+):/' ;;
   esac | LC_ALL=C sort -u >"$work/$1"
 }
 
@@ -79,7 +79,7 @@ run_case() { # tree, label, fif-args, grep-args, rg-args
 }
 
 echo "$(lscpu | grep 'Model name' | tr -s ' '), $(nproc) cores"
-echo "fif $("$fif" --version | cut -d' ' -f2) (Release), $(grep --version | head -1), $(rg --version | head -1), $(hyperfine --version)"
+echo "fif $("$fif" --version | cut -d' ' -f2) (Release), $(grep --version | head -1), $(rg --version 2>/dev/null | head -1), $(hyperfine --version)"
 echo "median of $runs runs after a warm-up; load average now: $(cut -d' ' -f1-3 /proc/loadavg)"
 status=0
 for tree in "${trees[@]}"; do
