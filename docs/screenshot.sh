@@ -30,7 +30,7 @@ session() {
     sleep 1
     xdotool key --clearmodifiers ctrl+shift+f
     local dialog
-    dialog="$(xdotool search --sync --onlyvisible --name '^Find in Files$' | head -1)"
+    dialog="$(xdotool search --sync --onlyvisible --name '^Find in Files Dialog$' | head -1)"
     xdotool windowfocus --sync "$dialog"
     sleep 0.5
     xdotool type --delay 40 'getJob'
