@@ -6,6 +6,7 @@
 #include "FifHit.h"
 #include "FifHitsView.h"
 #include "FifInput.h"
+#include "FifManager.h"
 #include "FifResultsDockWidget.h"
 #include "HelpManager.h"
 #include "ImageManager.h"
@@ -163,6 +164,11 @@ void FindInFilesWindow::createDocks()
         connect(dock, &QDockWidget::visibilityChanged, this,
                 &FindInFilesWindow::updateFindAction);
     }
+    // The second dock keeps a search of its own (job slot 1, started from
+    // its own tool bar), so it is not shown and raised by every search of
+    // the Find in Files command, which runs on slot 0.
+    if (auto* view = qobject_cast<FifHitsView*>(docks[1]->widget()))
+        view->setJob(FifManager::getInstance(this)->getJob(1));
     docks[1]->setWindowTitle(tr("Find in Files Results (2)"));
     tabifyDockWidget(docks[0], docks[1]);
     docks[1]->hide();

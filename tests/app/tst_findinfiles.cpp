@@ -114,6 +114,9 @@ private slots:
         QVERIFY(window.tabifiedDockWidgets(first).contains(second));
         QVERIFY(first->isVisible());
         QVERIFY(!second->isVisible());
+        FifManager* manager = FifManager::getInstance(&window);
+        QCOMPARE(viewOf(first)->getJob(), manager->getJob(0));
+        QCOMPARE(viewOf(second)->getJob(), manager->getJob(1));
         QCOMPARE(window.centralWidget(), window.getViewer());
         QVERIFY(window.getViewer()->isReadOnly());
 
@@ -187,6 +190,8 @@ private slots:
         QVERIFY(window.getNextAction()->isEnabled());
         QVERIFY(window.getPreviousAction()->isEnabled());
         QVERIFY(!window.getStopAction()->isEnabled());
+        QVERIFY(window.getResultsDock(0)->isVisible());
+        QVERIFY(!window.getResultsDock(1)->isVisible()); // not its search
 
         // Step through every hit with the shared next action.
         QAbstractItemModel* model = job->getHitsModel();
