@@ -58,9 +58,13 @@ void FifActionMapper::mapActions(bool isVisible)
 
     // The sender's own visibility is taken from the signal: while it is being
     // shown or hidden, QWidget::isVisible() may still tell the old state.
-    // Entries whose dock has been destroyed are passed over.
+    // A dock behind another in a tab group stays "visible" to Qt, moved out
+    // of sight; only a dock with something on screen counts. Entries whose
+    // dock has been destroyed are passed over.
     const auto countsAsVisible = [&](QDockWidget* dock) {
-        return dock == sendingDock ? isVisible : dock->isVisible();
+        if (dock == sendingDock)
+            return isVisible;
+        return dock->isVisible() && !dock->visibleRegion().isEmpty();
     };
     bool anyItems = false;
     bool anyRunning = false;

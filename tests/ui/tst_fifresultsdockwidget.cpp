@@ -18,6 +18,26 @@ FifHitsView* viewOf(QDockWidget* dock)
     return qobject_cast<FifHitsView*>(dock->widget());
 }
 
+// Qt keeps a dock behind another tab "visible", moved out of sight.
+bool inFront(QDockWidget* dock)
+{
+    return dock->isVisible() && !dock->visibleRegion().isEmpty();
+}
+
+// Runs `request` on `job` and waits until its thread has ended and its hits
+// have arrived. The search may end before the wait begins.
+bool runJob(FifJob* job, const FifInput& request)
+{
+    QSignalSpy finished(job, &QThread::finished);
+    if (!job->start(request))
+        return false;
+    if (finished.isEmpty() && !finished.wait(10000))
+        return false;
+    const bool ended = QTest::qWaitFor([job] { return !job->isRunning(); }, 10000);
+    QCoreApplication::processEvents();
+    return ended;
+}
+
 } // namespace
 
 class tst_FifResultsDockWidget : public QObject
@@ -100,7 +120,7 @@ private slots:
         FifInput request;
         request.what = "needle";
         request.where = dir.path();
-        FIF_RUN_JOB(job, request, 10000);
+        QVERIFY(runJob(job, request));
         for (QDockWidget* dock : {static_cast<QDockWidget*>(first), static_cast<QDockWidget*>(second)}) {
             auto* tree = viewOf(dock)->findChild<QTreeView*>("treeView");
             QVERIFY(tree);
@@ -131,23 +151,23 @@ private slots:
         window.show();
         QVERIFY(QTest::qWaitForWindowExposed(&window));
         first->raise();
-        QTRY_VERIFY(first->isVisible() && !second->isVisible());
+        QTRY_VERIFY(inFront(first) && !inFront(second));
 
         FifJob* job = viewOf(first)->getJob();
         FifInput request;
         request.what = "needle";
         request.where = dir.path();
-        FIF_RUN_JOB(job, request, 10000);
-        QTRY_VERIFY(second->isVisible());
-        QVERIFY(!first->isVisible());
+        QVERIFY(runJob(job, request));
+        QTRY_VERIFY(inFront(second));
+        QVERIFY(!inFront(first));
 
         // Attach the first dock's view again: it is now the later one.
         FifJob* other = FifManager::getInstance(&window)->getJob(1);
         viewOf(first)->setJob(other);
         viewOf(first)->setJob(job);
-        FIF_RUN_JOB(job, request, 10000);
-        QTRY_VERIFY(first->isVisible());
-        QVERIFY(!second->isVisible());
+        QVERIFY(runJob(job, request));
+        QTRY_VERIFY(inFront(first));
+        QVERIFY(!inFront(second));
     }
 
     // A hidden dock is shown by the start of a search on its job.
@@ -164,7 +184,7 @@ private slots:
         FifInput request;
         request.what = "needle";
         request.where = dir.path();
-        FIF_RUN_JOB(viewOf(dock)->getJob(), request, 10000);
+        QVERIFY(runJob(viewOf(dock)->getJob(), request));
         QVERIFY(dock->isVisible());
     }
 
