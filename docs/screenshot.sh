@@ -17,32 +17,31 @@ cmake --build "$build" --target findinfiles
 config="$(mktemp -d)"
 trap 'rm -rf "$config"' EXIT
 
-# Runs inside the virtual display.
-session() {
-    local app="$1" folder="$2" output="$3"
-    "$app" "$folder" &
-    local pid=$!
-    trap 'kill "$pid" 2>/dev/null || true' RETURN
+# Runs inside the virtual display: xvfb-run starts it through sh, so it is a
+# script file of its own rather than a shell function.
+cat >"$config/session.sh" <<'SESSION'
+set -euo pipefail
+app="$1" folder="$2" output="$3"
+"$app" "$folder" &
+pid=$!
+trap 'kill "$pid" 2>/dev/null || true' EXIT
 
-    local window
-    window="$(xdotool search --sync --onlyvisible --name '^Find in Files - ' | head -1)"
-    xdotool windowfocus --sync "$window"
-    sleep 1
-    xdotool key --clearmodifiers ctrl+shift+f
-    local dialog
-    dialog="$(xdotool search --sync --onlyvisible --name '^Find in Files Dialog$' | head -1)"
-    xdotool windowfocus --sync "$dialog"
-    sleep 0.5
-    xdotool type --delay 40 'getJob'
-    xdotool key Return          # "Find" is the default button
-    sleep 3                     # the search of a few files ends well within this
-    xdotool windowfocus --sync "$window"
-    xdotool key --clearmodifiers ctrl+F8 ctrl+F8 ctrl+F8
-    sleep 1
-    import -window "$window" "$output"
-}
-export -f session
+window="$(xdotool search --sync --onlyvisible --name '^Find in Files - ' | head -1)"
+xdotool windowfocus --sync "$window"
+sleep 1
+xdotool key --clearmodifiers ctrl+shift+f
+dialog="$(xdotool search --sync --onlyvisible --name '^Find in Files Dialog$' | head -1)"
+xdotool windowfocus --sync "$dialog"
+sleep 0.5
+xdotool type --delay 40 'getJob'
+xdotool key Return          # "Find" is the default button
+sleep 3                     # the search of a few files ends well within this
+xdotool windowfocus --sync "$window"
+xdotool key --clearmodifiers ctrl+F8 ctrl+F8 ctrl+F8
+sleep 1
+import -window "$window" "$output"
+SESSION
 
 XDG_CONFIG_HOME="$config" xvfb-run --auto-servernum --server-args="-screen 0 1280x900x24" \
-    bash -c 'session "$@"' session "$build/app/findinfiles" "$root/engine" "$output"
+    bash "$config/session.sh" "$build/app/findinfiles" "$root/engine" "$output"
 echo "Wrote $output"
