@@ -58,11 +58,14 @@ FileViewer::FileViewer(QWidget* parent)
 
 bool FileViewer::showHit(const Gui::Orba::FifHit& hit, QString* error)
 {
+    if (!hit.isValid()) {
+        if (error)
+            *error = tr("The result's search no longer exists.");
+        return false;
+    }
     const QString path = hit.getCanonicalFilePath();
     if (path.isEmpty()) {
-        QString name = hit.file;
-        if (hit.job)
-            name = QFileInfo(hit.job->getWorkingDir(), hit.file).absoluteFilePath();
+        const QString name = QFileInfo(hit.job->getWorkingDir(), hit.file).absoluteFilePath();
         if (error)
             *error = tr("%1 no longer exists.").arg(QDir::toNativeSeparators(name));
         return false;

@@ -39,6 +39,9 @@ FindInFilesWindow::FindInFilesWindow(const QString& folder, QWidget* parent)
 
     viewer = new FileViewer(this);
     setCentralWidget(viewer);
+    connect(viewer, &FileViewer::fileOpened, this, [this](const QString& path) {
+        setWindowTitle(tr("Find in Files - %1").arg(QDir::toNativeSeparators(path)));
+    });
 
     createActions();
     createDocks();

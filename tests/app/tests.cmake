@@ -1,8 +1,10 @@
-# The application test drives the application's own window and viewer.
-if(TARGET findinfiles_app)
-  target_link_libraries(tst_findinfiles PRIVATE findinfiles_app)
-else()
-  # Without the application there is nothing to test.
-  set_target_properties(tst_findinfiles PROPERTIES EXCLUDE_FROM_ALL ON)
-  set_tests_properties(tst_findinfiles PROPERTIES DISABLED ON)
-endif()
+# The application's tests drive the application's own window and viewer.
+foreach(test tst_findinfiles tst_fileviewer)
+  if(TARGET findinfiles_app)
+    target_link_libraries(${test} PRIVATE findinfiles_app)
+  else()
+    # Without the application there is nothing to test.
+    set_target_properties(${test} PROPERTIES EXCLUDE_FROM_ALL ON)
+    set_tests_properties(${test} PROPERTIES DISABLED ON)
+  endif()
+endforeach()
