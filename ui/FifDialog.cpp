@@ -111,7 +111,10 @@ void FifDialog::setJob(FifJob* newJob)
         disconnect(form->stop, &QPushButton::clicked, job, &FifJob::stop);
     }
     if (newJob) {
-        connect(newJob, &FifJob::aboutToStart, this, &FifDialog::updateButtons);
+        // aboutToStart() comes just before the thread is started, when the
+        // job does not run yet; queued, the buttons see the job running.
+        connect(newJob, &FifJob::aboutToStart, this, &FifDialog::updateButtons,
+                Qt::QueuedConnection);
         // Emitted from the search thread; runs queued here.
         connect(newJob, &QThread::finished, this, &FifDialog::updateButtons);
         connect(form->stop, &QPushButton::clicked, newJob, &FifJob::stop);

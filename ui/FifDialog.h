@@ -36,7 +36,7 @@ class FIF_EXPORT FifDialog : public Dialog
 
 public:
     // `settings` may be null: nothing is then read or written.
-    FifDialog(Settings* settings, QWidget* parent = nullptr);
+    FifDialog(Settings* settings, QWidget* parent);
     ~FifDialog() override;
 
     void setInput(const FifInput& input);
