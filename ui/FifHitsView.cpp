@@ -154,7 +154,13 @@ void FifHitsView::setJob(FifJob* newJob)
         connect(newJob, &FifJob::aboutToStart, this, &FifHitsView::onAboutToStart);
         connect(newJob, &FifJob::searching, this, &FifHitsView::onSearching);
         // Qt 6 threads have no terminated() signal; finished() covers every end.
-        connect(newJob, &QThread::finished, this, &FifHitsView::onEnded);
+        // It arrives queued from the job's thread, and a call already queued
+        // is still delivered after the job has been replaced: only the end of
+        // the job shown counts.
+        connect(newJob, &QThread::finished, this, [this, newJob] {
+            if (newJob == job)
+                onEnded();
+        });
         connect(stopAction, &QAction::triggered, newJob, &FifJob::stop);
         connect(clearAction, &QAction::triggered, this, &FifHitsView::removeAllRows,
                 Qt::UniqueConnection);
@@ -260,7 +266,7 @@ void FifHitsView::onFifAction()
 
 void FifHitsView::onAboutToStart()
 {
-    if (!job || isFromOtherJob())
+    if (!job)
         return;
     chaseWidget->setAnimated(true);
     chaseWidgetAction->setVisible(true);
@@ -277,7 +283,7 @@ void FifHitsView::onAboutToStart()
 
 void FifHitsView::onEnded()
 {
-    if (!job || isFromOtherJob())
+    if (!job)
         return;
     const QString status = tr("Found %n line(s)", "", job->getLineHitCount())
                          + tr(" in %n file(s)", "", job->getFileHitCount())
@@ -292,7 +298,7 @@ void FifHitsView::onEnded()
 
 void FifHitsView::onSearching(const QString& file)
 {
-    if (!job || isFromOtherJob())
+    if (!job)
         return;
     statusLabel->setText(tr("Searching %1").arg(file));
 }
@@ -422,13 +428,6 @@ bool FifHitsView::confirmWrap(const QString& title, const QString& text)
     if (treeView->model() != model || treeView->selectionModel() != selection)
         return false;
     return answer != QMessageBox::No;
-}
-
-bool FifHitsView::isFromOtherJob() const
-{
-    // Queued signals of a job that was replaced may still be on their way.
-    QObject* origin = sender();
-    return origin && qobject_cast<FifJob*>(origin) && origin != job;
 }
 
 void FifHitsView::selectAndShow(const QModelIndex& index)

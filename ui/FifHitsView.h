@@ -72,8 +72,6 @@ private:
     void nextOrPrevious(bool forward);
     // Asks whether to wrap around; false when the user declines.
     bool confirmWrap(const QString& title, const QString& text);
-    // True while a queued signal of a job that is no longer ours is handled.
-    bool isFromOtherJob() const;
     void selectAndShow(const QModelIndex& index);
     void setLinkedEnabled(QAction* own, QAction* linked, bool enabled);
     void link(QPointer<QAction>& linked, QAction* action, QAction* own);

@@ -188,6 +188,7 @@ private slots:
     void hiddenViewDisablesNavigation();
     void sameJobTwice();
     void replacedJob();
+    void staleEndOfReplacedJob();
     void modelUnderTesterWhileStreaming();
     void wrapPrompts_data();
     void wrapPrompts();
@@ -614,6 +615,10 @@ void tst_FifHitsView::hiddenViewDisablesNavigation()
     QVERIFY(view->isVisible());
     for (const char* name : kNavigationActions)
         QVERIFY2(!actionOf(view, name)->isEnabled(), name);
+    // Outside a search, row changes do not reach the actions.
+    job->getHitsModel()->insertRows(0, 1);
+    for (const char* name : kNavigationActions)
+        QVERIFY2(!actionOf(view, name)->isEnabled(), name);
     QVERIFY(runToEnd(job, request()));
     for (const char* name : kNavigationActions)
         QVERIFY2(actionOf(view, name)->isEnabled(), name);
@@ -704,6 +709,25 @@ void tst_FifHitsView::replacedJob()
     QVERIFY(!sharedStop.isEnabled());
     QVERIFY(newWatcher.wait());
     QVERIFY(view.getStatusLabel()->text().isEmpty());
+}
+
+void tst_FifHitsView::staleEndOfReplacedJob()
+{
+    makeTree(2, 1);
+    FifManager manager;
+    FifJob* oldJob = manager.getJob(0);
+    FifJob* newJob = manager.getJob(1);
+    FifHitsView view(oldJob, nullptr);
+    EndWatcher watcher(oldJob);
+    QVERIFY(oldJob->start(request()));
+    // Let the old job's end be queued for the view before it is replaced,
+    // without handling any event meanwhile.
+    while (!oldJob->isFinished())
+        QThread::msleep(1);
+    view.setJob(newJob);
+    QVERIFY(watcher.wait());
+    QCOMPARE(view.getStatusLabel()->text(), QString());
+    QVERIFY(!chaseActionOf(view)->isVisible());
 }
 
 void tst_FifHitsView::modelUnderTesterWhileStreaming()
@@ -1070,9 +1094,12 @@ void tst_FifHitsView::linkedActionsFollowState()
     QVERIFY(sharedNext.isEnabled());
     QVERIFY(sharedPrevious.isEnabled());
 
+    // Clearing recomputes every state, the stop command's included.
+    sharedStop.setEnabled(true);
     actionOf(&view, "clear-fifresults")->trigger();
     QVERIFY(!sharedNext.isEnabled());
     QVERIFY(!sharedPrevious.isEnabled());
+    QVERIFY(!sharedStop.isEnabled());
 }
 
 void tst_FifHitsView::saveThroughExportDialog()
