@@ -180,7 +180,7 @@ private slots:
         QVERIFY(TestTree::write(dir.path(), "f.txt", "x\nlonger text, needle\n"));
         QVERIFY(viewer.showHit(hits.first(), nullptr));
         QCOMPARE(viewer.textCursor().selectedText(), QString("needle"));
-        QCOMPARE(columnOfSelection(viewer), 14);
+        QCOMPARE(columnOfSelection(viewer), 13);
 
         QVERIFY(TestTree::write(dir.path(), "f.txt", "new first line\nx\nab needle\n"));
         QVERIFY(viewer.showHit(hits.first(), nullptr));
