@@ -87,18 +87,25 @@ bool FifWorker::isTextFile(const QFileInfo& info)
     QFile file(info.filePath());
     if (!file.open(QIODevice::ReadOnly))
         return false;
+    // Read in pieces rather than by readLine(), so that one huge first line
+    // does not have to fit in memory. Only "\n" ends a line, as for
+    // readLine(); line breaks are white space and never decide the answer.
     QTextStream stream(&file);
-    bool control = false;
-    for (int lines = 0; lines < 20 && !control && !stream.atEnd(); ++lines) {
-        const QString line = stream.readLine();
-        for (const QChar c : line) {
-            if (c.category() == QChar::Other_Control && !c.isSpace()) {
-                control = true;
-                break;
+    int lines = 0;
+    while (!stream.atEnd()) {
+        const QString piece = stream.read(4096);
+        if (piece.isEmpty())
+            break;
+        for (const QChar c : piece) {
+            if (c == QLatin1Char('\n')) {
+                if (++lines == 20)
+                    return true;
+            } else if (c.category() == QChar::Other_Control && !c.isSpace()) {
+                return false;
             }
         }
     }
-    return !control;
+    return true;
 }
 
 void FifWorker::searchFile(const QString& path)

@@ -214,7 +214,7 @@
         <translation type="unfinished"></translation>
     </message>
     <message>
-        <location line="+209"/>
+        <location line="+215"/>
         <source>Searching...</source>
         <translation type="unfinished"></translation>
     </message>

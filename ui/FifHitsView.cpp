@@ -139,13 +139,9 @@ void FifHitsView::setJob(FifJob* newJob)
 
     if (job) {
         // A search of the old job that is still being followed would never
-        // report its end here: leave the searching state now.
-        if (chaseWidgetAction->isVisible()) {
-            followRows(false);
-            chaseWidget->setAnimated(false);
-            chaseWidgetAction->setVisible(false);
-            setLinkedEnabled(stopAction, linkedStopAction, false);
-        }
+        // report its end here.
+        followRows(false);
+        leaveSearching();
         disconnect(job, nullptr, this, nullptr);
         disconnect(stopAction, &QAction::triggered, job, &FifJob::stop);
     }
@@ -162,6 +158,16 @@ void FifHitsView::setJob(FifJob* newJob)
                 onEnded();
         });
         connect(stopAction, &QAction::triggered, newJob, &FifJob::stop);
+        // The view does not own its job; one deleted under it must not be
+        // reached through a stale pointer.
+        connect(newJob, &QObject::destroyed, this, [this, newJob] {
+            if (newJob != job)
+                return;
+            // Its model, and with it the row connections, goes with it.
+            leaveSearching();
+            job = nullptr;
+            disconnect(clearAction, &QAction::triggered, this, &FifHitsView::removeAllRows);
+        });
         connect(clearAction, &QAction::triggered, this, &FifHitsView::removeAllRows,
                 Qt::UniqueConnection);
     } else {
@@ -438,6 +444,15 @@ void FifHitsView::selectAndShow(const QModelIndex& index)
     treeView->selectionModel()->select(index, QItemSelectionModel::ClearAndSelect);
     treeView->setCurrentIndex(index);
     emit showHit(hitOf(index));
+}
+
+void FifHitsView::leaveSearching()
+{
+    if (!chaseWidgetAction->isVisible())
+        return;
+    chaseWidget->setAnimated(false);
+    chaseWidgetAction->setVisible(false);
+    setLinkedEnabled(stopAction, linkedStopAction, false);
 }
 
 void FifHitsView::setLinkedEnabled(QAction* own, QAction* linked, bool enabled)

@@ -76,6 +76,9 @@ private:
     void setLinkedEnabled(QAction* own, QAction* linked, bool enabled);
     void link(QPointer<QAction>& linked, QAction* action, QAction* own);
     void followRows(bool follow);
+    // Stills the busy indicator and disables the stop commands of a search
+    // that is no longer followed.
+    void leaveSearching();
 
     FifJob* job = nullptr;
     QVBoxLayout* vboxLayout = nullptr;

@@ -143,7 +143,7 @@ private slots:
         QCOMPARE(aboutToStart.count(), 1);
         QCOMPARE(job->getInput().what, QStringLiteral("*"));
         job->stop();
-        QVERIFY(finished.wait(10000));
+        QVERIFY(finished.count() > 0 || finished.wait(10000));
         QTRY_VERIFY(!job->isRunning());
         QCOMPARE(finished.count(), 1);
         // The stop flag is clear again and the job starts at once.

@@ -176,6 +176,7 @@ private slots:
     void constructionTable_data();
     void constructionTable();
     void widgetTree();
+    void metaObjectInterface();
     void stateTable_data();
     void stateTable();
     void finalStatus_data();
@@ -189,6 +190,7 @@ private slots:
     void sameJobTwice();
     void replacedJob();
     void staleEndOfReplacedJob();
+    void jobDeletedUnderView();
     void modelUnderTesterWhileStreaming();
     void wrapPrompts_data();
     void wrapPrompts();
@@ -355,6 +357,22 @@ void tst_FifHitsView::widgetTree()
     FifHitsView empty(nullptr, nullptr);
     QVERIFY(!empty.getJob());
     QVERIFY(!empty.findChild<QTreeView*>()->model());
+}
+
+void tst_FifHitsView::metaObjectInterface()
+{
+    // The host connects by these signatures.
+    const QMetaObject& meta = FifHitsView::staticMetaObject;
+    QCOMPARE(meta.className(), "Gui::Orba::FifHitsView");
+    QStringList signatures;
+    for (int i = meta.methodOffset(); i < meta.methodCount(); ++i)
+        signatures << QString::fromLatin1(meta.method(i).methodSignature());
+    QCOMPARE(signatures, QStringList({"showHit(Gui::Orba::FifHit)", "next()", "previous()",
+                                      "setIconSize(QSize)", "onFifAction()", "onAboutToStart()",
+                                      "onEnded()", "onSearching(QString)", "updateActions()",
+                                      "showCurrentIndex()", "showIndex(QModelIndex)", "saveAs()",
+                                      "removeAllRows()"}));
+    QCOMPARE(meta.method(meta.methodOffset()).methodType(), QMetaMethod::Signal);
 }
 
 void tst_FifHitsView::stateTable_data()
@@ -728,6 +746,33 @@ void tst_FifHitsView::staleEndOfReplacedJob()
     QVERIFY(watcher.wait());
     QCOMPARE(view.getStatusLabel()->text(), QString());
     QVERIFY(!chaseActionOf(view)->isVisible());
+}
+
+void tst_FifHitsView::jobDeletedUnderView()
+{
+    makeTree(20, 2);
+    FifManager manager;
+    auto* job = new FifJob(&manager);
+    FifHitsView view(job, nullptr);
+    view.show();
+    QVERIFY(QTest::qWaitForWindowExposed(&view));
+    QAction sharedStop;
+    view.linkStopAction(&sharedStop);
+    QVERIFY(job->start(request()));
+    QVERIFY(chaseActionOf(view)->isVisible());
+    delete job; // stops the search and waits for its thread
+
+    QVERIFY(!view.getJob());
+    QVERIFY(!view.findChild<QTreeView*>()->model());
+    QVERIFY(!chaseActionOf(view)->isVisible());
+    QVERIFY(!sharedStop.isEnabled());
+    // Whatever was still queued, and every command, finds no job.
+    QTest::qWait(50);
+    sharedStop.trigger();
+    actionOf(&view, "clear-fifresults")->trigger();
+    view.next();
+    view.onFifAction();
+    QVERIFY(!view.getJob());
 }
 
 void tst_FifHitsView::modelUnderTesterWhileStreaming()
