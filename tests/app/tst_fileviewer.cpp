@@ -4,6 +4,7 @@
 #include "FifHitsModel.h"
 #include "FifJob.h"
 #include "FifManager.h"
+#include "JobRunner.h"
 #include "TestTree.h"
 
 #include <QTextBlock>
@@ -21,15 +22,8 @@ FifHitList search(FifJob* job, const QString& folder, const QString& what)
     FifInput request;
     request.what = what;
     request.where = folder;
-    QSignalSpy finished(job, &QThread::finished);
-    if (!job->start(request))
+    if (!JobRunner::run(job, request))
         return {};
-    // The search may end before the wait begins.
-    if (finished.isEmpty() && !finished.wait(10000))
-        return {};
-    if (!QTest::qWaitFor([job] { return !job->isRunning(); }, 10000))
-        return {};
-    QCoreApplication::processEvents();
     FifHitList hits;
     const FifHitsModel* model = job->getHitsModel();
     for (int row = 0; row < model->rowCount(QModelIndex()); ++row)
@@ -152,11 +146,7 @@ private slots:
         request.what = "get[A-Za-z]+\\(\\d+\\)";
         request.matchType = 3; // QRegExp::RegExp2
         request.where = dir.path();
-        QSignalSpy finished(job, &QThread::finished);
-        QVERIFY(job->start(request));
-        QVERIFY(!finished.isEmpty() || finished.wait(10000));
-        QTRY_VERIFY(!job->isRunning());
-        QCoreApplication::processEvents();
+        QVERIFY(JobRunner::run(job, request));
         QCOMPARE(job->getHitsModel()->rowCount(QModelIndex()), 1);
         const FifHit hit = job->getHitsModel()->index(0, 0).data(Qt::UserRole).value<FifHit>();
 

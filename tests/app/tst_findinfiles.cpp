@@ -11,6 +11,7 @@
 #include "FifResultsDockWidget.h"
 #include "FifSettings.h"
 #include "HostTestMain.h"
+#include "JobRunner.h"
 #include "TestTree.h"
 
 #include <QComboBox>
@@ -176,7 +177,7 @@ private slots:
         window.show();
         QVERIFY(QTest::qWaitForWindowExposed(&window));
         FifJob* job = FifManager::getInstance(&window)->getJob(0);
-        QSignalSpy finished(job, &QThread::finished);
+        JobRunner::EndWatcher watcher(job);
 
         QString offeredFolder;
         QVERIFY(answerDialog(window.getFindAction(), [&](FifDialog* dialog) {
@@ -184,8 +185,7 @@ private slots:
             search(dialog, "needle", dir.path());
         }));
         QCOMPARE(offeredFolder, QDir::toNativeSeparators(dir.path()));
-        QVERIFY(!finished.isEmpty() || finished.wait(10000));
-        QTRY_VERIFY(!job->isRunning());
+        QVERIFY(watcher.wait());
 
         FifHitsView* view = viewOf(window.getResultsDock(0));
         QTRY_COMPARE(view->getStatusLabel()->text(),
@@ -246,12 +246,11 @@ private slots:
         window.show();
         QVERIFY(QTest::qWaitForWindowExposed(&window));
         FifJob* job = FifManager::getInstance(&window)->getJob(0);
-        QSignalSpy finished(job, &QThread::finished);
+        JobRunner::EndWatcher watcher(job);
 
         QVERIFY(answerDialog(window.getFindAction(),
                              [&](FifDialog* dialog) { search(dialog, "word", other.path()); }));
-        QVERIFY(!finished.isEmpty() || finished.wait(10000));
-        QTRY_VERIFY(!job->isRunning());
+        QVERIFY(watcher.wait());
 
         QString offered;
         QVERIFY(answerDialog(window.getFindAction(), [&](FifDialog* dialog) {

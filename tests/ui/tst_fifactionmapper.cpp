@@ -4,6 +4,7 @@
 #include "FifJob.h"
 #include "FifManager.h"
 #include "FifResultsDockWidget.h"
+#include "JobRunner.h"
 #include "MainWindow.h"
 #include "TestTree.h"
 
@@ -69,17 +70,7 @@ bool fillJob(FifJob* job, const QString& folder, int hits)
     FifInput request;
     request.what = "needle";
     request.where = folder;
-    QSignalSpy finished(job, &QThread::finished);
-    if (!job->start(request))
-        return false;
-    // The search may end before the wait begins.
-    if (finished.isEmpty() && !finished.wait(10000))
-        return false;
-    // finished() comes just before the thread is marked as ended.
-    for (int waited = 0; job->isRunning() && waited < 10000; waited += 10)
-        QTest::qWait(10);
-    QCoreApplication::processEvents();
-    return job->getLineHitCount() == hits;
+    return JobRunner::run(job, request) && job->getLineHitCount() == hits;
 }
 
 } // namespace
@@ -312,7 +303,7 @@ private slots:
         FifInput request;
         request.what = "needle";
         request.where = dir.path();
-        QSignalSpy finished(job, &QThread::finished);
+        JobRunner::EndWatcher watcher(job);
         QVERIFY(job->start(request));
         QVERIFY(entered.tryAcquire(1, 10000));
         QVERIFY(job->isRunning());
@@ -323,8 +314,7 @@ private slots:
         QVERIFY(w.stop.isEnabled());
 
         release.release();
-        QVERIFY(!finished.isEmpty() || finished.wait(10000));
-        QTRY_VERIFY(!job->isRunning());
+        QVERIFY(watcher.wait());
         dock->hide();
         dock->show();
         QVERIFY(!w.stop.isEnabled());

@@ -2,6 +2,7 @@
 #include "FifJob.h"
 #include "FifManager.h"
 #include "FifResultsDockWidget.h"
+#include "JobRunner.h"
 #include "MainWindow.h"
 #include "TestTree.h"
 
@@ -24,18 +25,9 @@ bool inFront(QDockWidget* dock)
     return dock->isVisible() && !dock->visibleRegion().isEmpty();
 }
 
-// Runs `request` on `job` and waits until its thread has ended and its hits
-// have arrived. The search may end before the wait begins.
 bool runJob(FifJob* job, const FifInput& request)
 {
-    QSignalSpy finished(job, &QThread::finished);
-    if (!job->start(request))
-        return false;
-    if (finished.isEmpty() && !finished.wait(10000))
-        return false;
-    const bool ended = QTest::qWaitFor([job] { return !job->isRunning(); }, 10000);
-    QCoreApplication::processEvents();
-    return ended;
+    return JobRunner::run(job, request);
 }
 
 } // namespace
