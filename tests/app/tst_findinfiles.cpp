@@ -18,6 +18,7 @@
 #include <QLabel>
 #include <QMenu>
 #include <QMenuBar>
+#include <QProcess>
 #include <QPushButton>
 #include <QStatusBar>
 #include <QTextBlock>
@@ -234,6 +235,38 @@ private slots:
         QCOMPARE(viewer->getFilePath(), shownPath);
         QCOMPARE(viewer->toPlainText(), shownText);
         QCOMPARE(viewer->getCurrentLine(), shownLine);
+    }
+
+    // The executable refuses what it cannot start in, with a message.
+    void commandLine_data()
+    {
+        QTest::addColumn<QStringList>("arguments");
+        QTest::addColumn<int>("exitCode");
+        QTest::addColumn<QString>("output");
+        QTest::newRow("missing folder") << QStringList{"/no/such/folder"} << 2
+                                        << "/no/such/folder is not a folder that can be opened.";
+        QTest::newRow("a file") << QStringList{QString(FIF_TEST_FILE)} << 2
+                                << QString(FIF_TEST_FILE) + " is not a folder that can be opened.";
+        QTest::newRow("two folders") << QStringList{"/", "/tmp"} << 2
+                                     << "Name one folder at most.";
+        QTest::newRow("version") << QStringList{"--version"} << 0 << "findinfiles ";
+    }
+    void commandLine()
+    {
+        QFETCH(QStringList, arguments);
+        QFETCH(int, exitCode);
+        QFETCH(QString, output);
+        const QString program = qEnvironmentVariable("FIF_BINARY_DIR") + "/app/findinfiles";
+        if (!QFileInfo::exists(program))
+            QSKIP("the findinfiles executable is not built");
+        QProcess process;
+        process.start(program, arguments);
+        QVERIFY(process.waitForFinished(30000));
+        QCOMPARE(process.exitStatus(), QProcess::NormalExit);
+        QCOMPARE(process.exitCode(), exitCode);
+        const QString text = QString::fromLocal8Bit(process.readAllStandardOutput()
+                                                    + process.readAllStandardError());
+        QVERIFY2(text.contains(output), qPrintable(text));
     }
 
     // The start folder is offered once; later the folder searched last.
