@@ -180,6 +180,21 @@ private slots:
         QVERIFY(dock->isVisible());
     }
 
+    // Without a main window there is no job and nothing to dock in: the
+    // dock holds an empty view and keeps its base name.
+    void builtWithoutMainWindow()
+    {
+        FifResultsDockWidget dock(nullptr);
+        QCOMPARE(dock.objectName(), QString("FifResultsDockWidget"));
+        QVERIFY(viewOf(&dock));
+        QVERIFY(!viewOf(&dock)->getJob());
+        QAction next;
+        dock.linkSharedActions(&next, nullptr, nullptr); // no window: nothing happens
+        dock.show();
+        dock.hide();
+        QVERIFY(next.isEnabled());
+    }
+
     // Only a dock whose parent is a main window hands over its actions.
     void linkWithoutMainWindowDoesNothing()
     {
