@@ -81,6 +81,8 @@ qint64 FifFileDevice::readData(char* data, qint64 maxSize)
 {
     if (fd < 0)
         return -1;
+    if (maxSize <= 0 || !data)
+        return 0;
     qint64 done = 0;
     if (position < first->size()) {
         done = qMin<qint64>(maxSize, first->size() - position);
