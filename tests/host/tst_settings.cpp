@@ -67,21 +67,6 @@ private slots:
         COMPARE_TYPED(fresh.getValue(keyPath), value);
     }
 
-    void fileIsPlainIni()
-    {
-        QTemporaryDir dir;
-        const QString fileName = dir.filePath("settings.ini");
-        {
-            Settings settings(fileName);
-            settings.setValue("FindBar/Find what", QStringList{"foo", "bar"});
-            settings.setValue("FindBar/MatchCase", true);
-        }
-        const QByteArray text = IniFiles::contents(fileName);
-        QVERIFY(text.contains("[FindBar]"));
-        QVERIFY(text.contains("Find%20what=foo, bar"));
-        QVERIFY(text.contains("MatchCase=true"));
-    }
-
     void laterValueReplacesTypeOfEarlier()
     {
         QTemporaryDir dir;
