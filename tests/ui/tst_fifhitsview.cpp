@@ -6,6 +6,7 @@
 #include "FifHitsView.h"
 #include "FifJob.h"
 #include "FifManager.h"
+#include "JobRunner.h"
 #include "Settings.h"
 #include "TestTree.h"
 
@@ -45,26 +46,11 @@ public:
     }
 };
 
-// Waits, in the GUI thread, for the end of a run of `job`. Connected after the
-// view, so by the time it fires the view has handled the end as well.
-class EndWatcher
-{
-public:
-    explicit EndWatcher(FifJob* job)
-    {
-        QObject::connect(job, &QThread::finished, &context, [this] { ended = true; });
-    }
-    bool wait() { return QTest::qWaitFor([this] { return ended; }, 30000); }
-
-private:
-    QObject context;
-    bool ended = false;
-};
+using JobRunner::EndWatcher;
 
 bool runToEnd(FifJob* job, const FifInput& request)
 {
-    EndWatcher watcher(job);
-    return job->start(request) && watcher.wait();
+    return JobRunner::run(job, request, 30000);
 }
 
 // Polls for modal widgets of type T and hands each to `answer` until it is
