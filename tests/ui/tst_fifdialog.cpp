@@ -176,17 +176,13 @@ bool hasFocus(QDialog& dialog, QComboBox* box)
     return focus && (focus == box || focus == box->lineEdit());
 }
 
-QStringList allKeyPaths()
-{
-    const FifSettings keys;
-    return {keys.getFindWhatKeyPath(), keys.getMatchCaseKeyPath(), keys.getMatchWordKeyPath(),
-            keys.getMatchTypeKeyPath(), keys.getWhereKeyPath(), keys.getFilterKeyPath(),
-            keys.getIncludeSubFolderKeyPath()};
-}
-
 bool nothingStored(const Settings& settings)
 {
-    for (const QString& key : allKeyPaths()) {
+    const FifSettings k;
+    for (const QString& key : {k.getFindWhatKeyPath(), k.getMatchCaseKeyPath(),
+                               k.getMatchWordKeyPath(), k.getMatchTypeKeyPath(),
+                               k.getWhereKeyPath(), k.getFilterKeyPath(),
+                               k.getIncludeSubFolderKeyPath()}) {
         if (!settings.getValue(key).isNull())
             return false;
     }
