@@ -398,8 +398,11 @@ void FifHitsView::nextOrPrevious(bool forward)
         return;
 
     int target = forward ? 0 : rows - 1;
+    // The tree view makes its first row current, unselected, when it takes
+    // the focus; only a row the user or a step has chosen counts, so the
+    // first step still lands on the first (or last) hit.
     const QModelIndex current = treeView->currentIndex();
-    if (current.isValid()) {
+    if (current.isValid() && selection->isSelected(current)) {
         target = current.row() + (forward ? 1 : -1);
         if (target > rows - 1) {
             if (!confirmWrap(tr("Reach bottom"), tr("Reach bottom, continued from top?")))
