@@ -609,6 +609,13 @@ private slots:
         QCOMPARE(c.what->currentIndex(), 2);
         QCOMPARE(c.items(c.filter), QStringList({"*.cpp", "*.h", "*.txt"}));
         QCOMPARE(c.filter->currentText(), QString("*.txt"));
+
+        // An empty text shows as empty but is no history entry, so it is
+        // not stored with the next search.
+        input.what.clear();
+        dialog.setInput(input);
+        QCOMPARE(c.items(c.what), QStringList({"a", "b", "B"}));
+        QCOMPARE(c.what->currentText(), QString());
     }
 
     void setInputMapsTheOptions_data()

@@ -596,6 +596,25 @@ private slots:
         QVERIFY(answerer.titles.isEmpty());
     }
 
+    void unselectedCurrentRowCountsAsNone()
+    {
+        // Taking the focus makes the first row current without selecting it;
+        // the first step must still show the first hit, not the second.
+        auto s = searched(3, 1);
+        QVERIFY(s);
+        QSignalSpy spy(&s->view, &FifHitsView::showHit);
+        s->tree()->selectionModel()->setCurrentIndex(s->model()->index(0, 0),
+                                                     QItemSelectionModel::NoUpdate);
+        s->view.next();
+        QCOMPARE(s->current(), 0);
+        QVERIFY(s->emitted(spy, 0, 0));
+        s->tree()->selectionModel()->setCurrentIndex(s->model()->index(0, 0),
+                                                     QItemSelectionModel::Clear);
+        s->view.previous();
+        QCOMPARE(s->current(), 2);
+        QVERIFY(s->emitted(spy, 1, 2));
+    }
+
     void oneRowWraps()
     {
         auto s = searched(1, 1);
