@@ -92,8 +92,7 @@ private slots:
         FifInput request;
         request.what = "needle";
         request.where = "src;docs";
-        const QByteArray expected = engineLines(request);
-        QCOMPARE(r.out, expected);
+        QCOMPARE(r.out, engineLines(request));
         QCOMPARE(r.out.count('\n'), 7);
         QVERIFY(r.out.contains("src/a.cpp (1): int needle;\n"));
         QVERIFY(r.out.contains("docs/d.txt (1): caf\xC3\xA9 needle\n"));
@@ -148,35 +147,34 @@ private slots:
         QVERIFY(r.err.startsWith("Found "));
     }
 
-    void nothingFound()
+    void exitCodes_data()
     {
-        const Result r = fif({"no such text", "src"});
-        QCOMPARE(r.exitCode, 1);
-        QVERIFY(r.out.isEmpty());
-        QCOMPARE(r.err, QByteArray("Found 0 line(s) in 0 file(s) out of 4 file(s)\n"));
-    }
-
-    void badExpressions()
-    {
-        Result r = fif({"", "src"});
-        QCOMPARE(r.exitCode, 2);
-        QVERIFY(r.out.isEmpty());
-        QCOMPARE(r.err, QByteArray("Empty Expression: Please enter the search expression in "
-                                   "the \"Find what:\" field.\n"));
-
-        r = fif({"--regexp", "(", "src"});
-        QCOMPARE(r.exitCode, 2);
-        QVERIFY(r.out.isEmpty());
+        QTest::addColumn<QStringList>("arguments");
+        QTest::addColumn<int>("exitCode");
+        QTest::addColumn<QString>("err");
         FifInput request;
         request.what = "(";
         request.matchType = QRegExp::RegExp2;
-        const QString error = request.getRegExp().errorString();
-        QVERIFY(!error.isEmpty());
-        QCOMPARE(QString::fromUtf8(r.err), "Bad Expression: " + error + ": \"(\"\n");
+        const QString nothing = "Found 0 line(s) in 0 file(s) out of 4 file(s)\n";
+        QTest::newRow("nothing found") << QStringList{"no such text", "src"} << 1 << nothing;
+        QTest::newRow("empty") << QStringList{"", "src"} << 2
+                               << "Empty Expression: Please enter the search expression in "
+                                  "the \"Find what:\" field.\n";
+        QTest::newRow("bad regexp") << QStringList{"--regexp", "(", "src"} << 2
+                                    << "Bad Expression: " + request.getRegExp().errorString()
+                                           + ": \"(\"\n";
+        QTest::newRow("same text, literal") << QStringList{"(", "src"} << 1 << nothing;
+    }
 
-        // The same text is literal by default.
-        r = fif({"(", "src"});
-        QCOMPARE(r.exitCode, 1);
+    void exitCodes()
+    {
+        QFETCH(QStringList, arguments);
+        QFETCH(int, exitCode);
+        QFETCH(QString, err);
+        const Result r = fif(arguments);
+        QCOMPARE(r.exitCode, exitCode);
+        QVERIFY(r.out.isEmpty());
+        QCOMPARE(QString::fromUtf8(r.err), err);
     }
 
     void badArguments_data()

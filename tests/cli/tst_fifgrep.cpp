@@ -4,6 +4,7 @@
 // name.
 
 #include "FifWorker.h"
+#include "TestTree.h"
 
 #include <QProcess>
 #include <QRegularExpression>
@@ -92,14 +93,8 @@ private slots:
         // do come up: a file with a control character in its first lines,
         // and a link to a text file.
         QVERIFY(extra.isValid());
-        QFile control(extra.path() + "/control.h");
-        QVERIFY(control.open(QIODevice::WriteOnly));
-        control.write("\x01 not text\nQString s;\n");
-        control.close();
-        QFile text(extra.path() + "/text.h");
-        QVERIFY(text.open(QIODevice::WriteOnly));
-        text.write("QString t;\n");
-        text.close();
+        QVERIFY(TestTree::write(extra.path(), "control.h", "\x01 not text\nQString s;\n"));
+        QVERIFY(TestTree::write(extra.path(), "text.h", "QString t;\n"));
         QVERIFY(QFile::link(extra.path() + "/text.h", extra.path() + "/link.h"));
         folders.append(extra.path());
     }
@@ -179,7 +174,6 @@ private slots:
         // Files that fail fif's text test (a control character in the first
         // 20 lines) are not searched; grep -a reads them all.
         QSet<QString> notText;
-        QStringList explained;
         for (auto it = grepHits.begin(); it != grepHits.end();) {
             const QString& file = it->file;
             if (!notText.contains(file) && !FifWorker::isTextFile(QFileInfo(file)))
@@ -190,10 +184,8 @@ private slots:
             }
             ++it;
         }
-        for (const QString& file : qAsConst(notText))
-            explained.append(file);
-        if (!explained.isEmpty())
-            qInfo() << "not text to fif, so not searched:" << explained;
+        if (!notText.isEmpty())
+            qInfo() << "not text to fif, so not searched:" << notText.values();
         if (pattern == "QString") {
             QVERIFY(notText.contains(extra.path() + "/control.h"));
             QVERIFY(fifHits.contains(keyOf({extra.path() + "/text.h", 1, "QString t;"})));
@@ -207,16 +199,10 @@ private slots:
         for (const Hit& hit : qAsConst(grepHits))
             QVERIFY2(!QFileInfo(hit.file).isSymLink(), qPrintable(hit.file));
 
-        QStringList onlyFif;
-        for (auto it = fifHits.cbegin(); it != fifHits.cend(); ++it) {
-            if (!grepHits.contains(it.key()))
-                onlyFif.append(it.key());
-        }
-        QStringList onlyGrep;
-        for (auto it = grepHits.cbegin(); it != grepHits.cend(); ++it) {
-            if (!fifHits.contains(it.key()))
-                onlyGrep.append(it.key());
-        }
+        const QSet<QString> fifKeys(fifHits.keyBegin(), fifHits.keyEnd());
+        const QSet<QString> grepKeys(grepHits.keyBegin(), grepHits.keyEnd());
+        QStringList onlyFif = (fifKeys - grepKeys).values();
+        QStringList onlyGrep = (grepKeys - fifKeys).values();
         onlyFif.sort();
         onlyGrep.sort();
         QCOMPARE(onlyFif.mid(0, 5), QStringList());

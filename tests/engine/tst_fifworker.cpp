@@ -181,17 +181,6 @@ private slots:
         QCOMPARE(job->getFileHitCount(), 3);
     }
 
-    void emptyWhereSearchesNothing()
-    {
-        FifManager manager;
-        FifJob* job = nullptr;
-        QStringList searched;
-        run(manager, makeRequest("needle", ""), job, &searched);
-        QVERIFY(searched.isEmpty());
-        QCOMPARE(job->getLineHitCount(), 0);
-        QCOMPARE(job->getReadFileCount(), 0);
-    }
-
     // --- listing -----------------------------------------------------------
 
     void listing_data()
@@ -357,78 +346,92 @@ private slots:
 
     // --- scanning ----------------------------------------------------------
 
-    void scanningRules()
+    // One hit per line at its first match. Offsets count characters as
+    // decoded, a line end as one; raw offsets count "\r\n" as two.
+    void scanning_data()
     {
-        const QString base = root + "/scan";
-        // Line 3 starts after "one" and "three", each ended by "\r\n".
-        QVERIFY(TestTree::write(base, "crlf.txt", "one\r\nthree\r\nneedle needle\r\nlast needle"));
-        FifManager manager;
-        FifJob* job = nullptr;
-        run(manager, makeRequest("needle", base), job);
-        const QList<FifHit> hits = hitsOf(job);
-        QCOMPARE(hits.size(), 2);
-        QCOMPARE(hits[0].file, base + "/crlf.txt");
-        QCOMPARE(hits[0].line, 3);
-        QCOMPARE(hits[0].text, QStringLiteral("needle needle"));
-        QCOMPARE(hits[0].offset, 3 + 5 + 2);
-        QCOMPARE(hits[0].rawOffset, 3 + 5 + 4);
-        QCOMPARE(hits[0].job.data(), job);
-        // The last line has no line feed and is matched all the same.
-        QCOMPARE(hits[1].line, 4);
-        QCOMPARE(hits[1].text, QStringLiteral("last needle"));
-        QCOMPARE(hits[1].offset, 3 + 5 + 13 + 3 + 5);
-        QCOMPARE(hits[1].rawOffset, 3 + 5 + 13 + 6 + 5);
+        QTest::addColumn<QByteArray>("bytes");
+        QTest::addColumn<QString>("what");
+        QTest::addColumn<int>("type");
+        QTest::addColumn<QList<int>>("lines");
+        QTest::addColumn<QList<int>>("offsets");
+        QTest::addColumn<QList<int>>("rawOffsets"); // empty: not checked
+        QTest::addColumn<QStringList>("texts");
+        const int fixed = QRegExp::FixedString;
+        QTest::newRow("crlf, last line without line feed")
+            << QByteArray("one\r\nthree\r\nneedle needle\r\nlast needle") << "needle" << fixed
+            << QList<int>{3, 4} << QList<int>{10, 29} << QList<int>{12, 32}
+            << QStringList{"needle needle", "last needle"};
+        QTest::newRow("lone carriage return")
+            << QByteArray("one\rneedle\ntwo") << "needle" << fixed << QList<int>{1}
+            << QList<int>{4} << QList<int>{} << QStringList{"one\rneedle"};
+        QTest::newRow("empty match hits every line")
+            << QByteArray("a\n\n\r\nbc\n") << "*" << int(QRegExp::Wildcard)
+            << QList<int>{1, 2, 3, 4} << QList<int>{0, 2, 3, 4} << QList<int>{0, 2, 3, 5}
+            << QStringList{"a", "", "", "bc"};
+        // A physical line is one line: later lines keep their numbers and a
+        // match across any 1023-byte boundary is found.
+        QByteArray longLine(2499, 'x');
+        longLine.replace(1020, 6, "needle");
+        QTest::newRow("long line") << longLine + "\nneedle\n" << "needle" << fixed
+                                   << QList<int>{1, 2} << QList<int>{1020, 2500}
+                                   << QList<int>{1020, 2500}
+                                   << QStringList{QString::fromLatin1(longLine), "needle"};
+        // Lines decode as UTF-8: found as written, case ignored.
+        QTest::newRow("utf-8") << QByteArray("caf\xC3\xA9 NA\xC3\x8FVE\nna\xC3\xAFve\n")
+                               << QString::fromUtf8("naïve") << fixed << QList<int>{1, 2}
+                               << QList<int>{5, 11} << QList<int>{}
+                               << QStringList{QString::fromUtf8("café NAÏVE"),
+                                              QString::fromUtf8("naïve")};
+        // A zero byte after line 20 is a character like any other: it cuts
+        // neither its line's text nor the offsets of later lines.
+        QByteArray zero;
+        for (int i = 1; i <= 21; ++i)
+            zero += "abc\n";
+        QTest::newRow("zero byte after line 20")
+            << zero + QByteArray("x\0y needle\nneedle\n", 18) << "needle" << fixed
+            << QList<int>{22, 23} << QList<int>{88, 95} << QList<int>{88, 95}
+            << QStringList{QString::fromLatin1("x\0y needle", 10), "needle"};
+        // Read in the encoding of the byte-order mark, which is not counted.
+        for (auto encoding : {QStringConverter::Utf16LE, QStringConverter::Utf16BE,
+                              QStringConverter::Utf32LE, QStringConverter::Utf32BE}) {
+            QStringEncoder encoder(encoding, QStringConverter::Flag::WriteBom);
+            const QByteArray bytes =
+                encoder.encode(QString::fromUtf8("alpha\r\nna\xC3\xAFve needle\nneedle"));
+            QTest::addRow("byte-order mark, %s", QStringConverter::nameForEncoding(encoding))
+                << bytes << "needle" << fixed << QList<int>{2, 3} << QList<int>{12, 19}
+                << QList<int>{13, 20} << QStringList{QString::fromUtf8("naïve needle"), "needle"};
+        }
     }
 
-    void loneCarriageReturn()
+    void scanning()
     {
-        const QString base = root + "/lonecr";
-        QVERIFY(TestTree::write(base, "cr.txt", "one\rneedle\ntwo"));
+        QFETCH(QByteArray, bytes);
+        QFETCH(QString, what);
+        QFETCH(int, type);
+        QFETCH(QList<int>, lines);
+        QFETCH(QList<int>, offsets);
+        QFETCH(QList<int>, rawOffsets);
+        QFETCH(QStringList, texts);
+        const QString base = root + "/scan/" + QTest::currentDataTag();
+        QVERIFY(TestTree::write(base, "f.txt", bytes));
         FifManager manager;
         FifJob* job = nullptr;
-        run(manager, makeRequest("needle", base), job);
-        const QList<FifHit> hits = hitsOf(job);
-        QCOMPARE(hits.size(), 1);
-        QCOMPARE(hits[0].line, 1);
-        QCOMPARE(hits[0].offset, 4);
-        QCOMPARE(hits[0].text, QStringLiteral("one\rneedle"));
-    }
-
-    // The wildcard "*" matches the empty string: every line is a hit at 0.
-    void emptyMatchHitsEveryLine()
-    {
-        const QString base = root + "/star";
-        QVERIFY(TestTree::write(base, "s.txt", "a\n\n\r\nbc\n"));
-        FifManager manager;
-        FifJob* job = nullptr;
-        FifInput request = makeRequest("*", base);
-        request.matchType = QRegExp::Wildcard;
+        FifInput request = makeRequest(what, base);
+        request.matchType = type;
+        request.matchCase = Qt::CaseInsensitive;
         run(manager, request, job);
         const QList<FifHit> hits = hitsOf(job);
-        QCOMPARE(linesOf(hits), QList<int>({1, 2, 3, 4}));
-        QCOMPARE(hits[2].text, QString());
-        QCOMPARE(hits[3].offset, 2 + 1 + 1);
-        QCOMPARE(hits[3].rawOffset, 2 + 1 + 2);
-    }
-
-    // --- behaviours kept sound ---------------------------------------------
-
-    // A physical line of 2500 bytes is one line: later lines keep their
-    // numbers and a match across any 1023-byte boundary is found.
-    void longLineIsOneLine()
-    {
-        const QString base = root + "/long";
-        QByteArray line(2499, 'x');
-        line.replace(1020, 6, "needle");
-        QVERIFY(TestTree::write(base, "l.txt", line + "\nneedle\n"));
-        FifManager manager;
-        FifJob* job = nullptr;
-        run(manager, makeRequest("needle", base), job);
-        const QList<FifHit> hits = hitsOf(job);
-        QCOMPARE(linesOf(hits), QList<int>({1, 2}));
-        QCOMPARE(hits[0].offset, 1020);
-        QCOMPARE(hits[0].text.size(), 2499);
-        QCOMPARE(hits[1].offset, 2500);
+        QCOMPARE(job->getReadFileCount(), 1);
+        QCOMPARE(linesOf(hits), lines);
+        for (int i = 0; i < hits.size(); ++i) {
+            QCOMPARE(hits[i].file, base + "/f.txt");
+            QCOMPARE(hits[i].job.data(), job);
+            QCOMPARE(hits[i].offset, offsets[i]);
+            if (!rawOffsets.isEmpty())
+                QCOMPARE(hits[i].rawOffset, rawOffsets[i]);
+            QCOMPARE(hits[i].text, texts[i]);
+        }
     }
 
     // A line of 16 MiB is matched whole; a longer one may be cut for
@@ -464,79 +467,6 @@ private slots:
         QVERIFY(hits[1].text.startsWith("needleyyy"));
         QCOMPARE(hits[2].offset, int(mib16 + 1 + mib16 + 1000 + 1 + 2));
         QCOMPARE(hits[2].rawOffset, int(mib16 + 2 + mib16 + 1000 + 2 + 2));
-    }
-
-    // Lines decode as UTF-8: "naïve" is found as written, case ignored, and
-    // offsets count characters.
-    void utf8Text()
-    {
-        const QString base = root + "/utf8";
-        QVERIFY(TestTree::write(base, "u.txt", "caf\xC3\xA9 NA\xC3\x8FVE\nna\xC3\xAFve\n"));
-        FifManager manager;
-        FifJob* job = nullptr;
-        FifInput request = makeRequest(QString::fromUtf8("naïve"), base);
-        request.matchCase = Qt::CaseInsensitive;
-        run(manager, request, job);
-        const QList<FifHit> hits = hitsOf(job);
-        QCOMPARE(linesOf(hits), QList<int>({1, 2}));
-        QCOMPARE(hits[0].text, QString::fromUtf8("café NAÏVE"));
-        QCOMPARE(hits[0].offset, 5);
-        QCOMPARE(hits[1].offset, 11);
-        QCOMPARE(hits[1].text, QString::fromUtf8("naïve"));
-    }
-
-    // A zero byte after line 20 is a character like any other: it neither
-    // cuts its line's text nor the offsets of later lines.
-    void zeroByteAfterLine20()
-    {
-        const QString base = root + "/zero";
-        QByteArray bytes;
-        for (int i = 1; i <= 21; ++i)
-            bytes += "abc\n";
-        bytes += QByteArray("x\0y needle\n", 11);
-        bytes += "needle\n";
-        QVERIFY(TestTree::write(base, "z.txt", bytes));
-        FifManager manager;
-        FifJob* job = nullptr;
-        run(manager, makeRequest("needle", base), job);
-        const QList<FifHit> hits = hitsOf(job);
-        QCOMPARE(linesOf(hits), QList<int>({22, 23}));
-        QCOMPARE(hits[0].text, QString::fromLatin1("x\0y needle", 10));
-        QCOMPARE(hits[0].offset, 21 * 4 + 4);
-        QCOMPARE(hits[1].offset, 21 * 4 + 11);
-    }
-
-    void unicodeWithByteOrderMark_data()
-    {
-        QTest::addColumn<int>("encoding");
-        QTest::newRow("utf-16 le") << int(QStringConverter::Utf16LE);
-        QTest::newRow("utf-16 be") << int(QStringConverter::Utf16BE);
-        QTest::newRow("utf-32 le") << int(QStringConverter::Utf32LE);
-        QTest::newRow("utf-32 be") << int(QStringConverter::Utf32BE);
-    }
-
-    // Such a file passes the text test and is read in its encoding; offsets
-    // count its characters, the mark not counted.
-    void unicodeWithByteOrderMark()
-    {
-        QFETCH(int, encoding);
-        const QString base = root + "/unicode/" + QTest::currentDataTag();
-        QStringEncoder encoder(QStringConverter::Encoding(encoding),
-                               QStringConverter::Flag::WriteBom);
-        const QByteArray bytes =
-            encoder.encode(QString::fromUtf8("alpha\r\nna\xC3\xAFve needle\nneedle"));
-        QVERIFY(TestTree::write(base, "w.txt", bytes));
-        FifManager manager;
-        FifJob* job = nullptr;
-        run(manager, makeRequest("needle", base), job);
-        const QList<FifHit> hits = hitsOf(job);
-        QCOMPARE(job->getReadFileCount(), 1);
-        QCOMPARE(linesOf(hits), QList<int>({2, 3}));
-        QCOMPARE(hits[0].text, QString::fromUtf8("naïve needle"));
-        QCOMPARE(hits[0].offset, 6 + 6);
-        QCOMPARE(hits[0].rawOffset, 7 + 6);
-        QCOMPARE(hits[1].offset, 6 + 13);
-        QCOMPARE(hits[1].rawOffset, 7 + 13);
     }
 
     // --- sending hits ------------------------------------------------------
