@@ -10,7 +10,8 @@ file(GLOB FIF_UI_SOURCES CONFIGURE_DEPENDS
 # Headers that stay inside the library: not exported, not installed.
 set(FIF_PRIVATE_HEADERS
     ${PROJECT_SOURCE_DIR}/engine/FifWorker.h
-    ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h)
+    ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h
+    ${PROJECT_SOURCE_DIR}/engine/FifLocker.h)
 
 add_library(FindInFiles SHARED ${FIF_ENGINE_SOURCES} ${FIF_UI_SOURCES})
 add_library(FindInFiles::FindInFiles ALIAS FindInFiles)

@@ -1,6 +1,7 @@
 #include "FifHitsModel.h"
 
 #include "FifJob.h"
+#include "FifLocker.h"
 
 namespace Gui {
 namespace Orba {
@@ -10,13 +11,16 @@ FifHitsModel::FifHitsModel(QObject* parent)
 {
 }
 
-FifHitsModel::~FifHitsModel() = default;
+FifHitsModel::~FifHitsModel()
+{
+    FifLocker::forget(&lock);
+}
 
 int FifHitsModel::rowCount(const QModelIndex& parent) const
 {
     if (parent.isValid())
         return 0;
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return int(hits.size());
 }
 
@@ -26,7 +30,7 @@ QVariant FifHitsModel::data(const QModelIndex& index, int role) const
         return QVariant();
     FifHit hit;
     {
-        QReadLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Read);
         if (index.row() >= hits.size())
             return QVariant();
         hit = hits.at(index.row());
@@ -49,7 +53,7 @@ bool FifHitsModel::setData(const QModelIndex& index, const QVariant& value, int 
     if (!index.isValid() || role != Qt::EditRole)
         return false;
     {
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         if (index.row() >= hits.size())
             return false;
         hits[index.row()] = value.value<FifHit>();
@@ -77,7 +81,7 @@ bool FifHitsModel::insertRows(int row, int count, const QModelIndex& /*parent*/)
         return false;
     beginInsertRows(QModelIndex(), row, row + count - 1);
     {
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         hits.insert(row, count, FifHit());
     }
     endInsertRows();
@@ -93,7 +97,7 @@ bool FifHitsModel::removeRows(int row, int count, const QModelIndex& /*parent*/)
     const int last = qMin(row + count, size) - 1;
     beginRemoveRows(QModelIndex(), row, last);
     {
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         hits.remove(row, last - row + 1);
     }
     endRemoveRows();

@@ -1,6 +1,7 @@
 #include "FifJob.h"
 
 #include "FifHitsModel.h"
+#include "FifLocker.h"
 #include "FifManager.h"
 #include "FifWorker.h"
 
@@ -23,6 +24,7 @@ FifJob::~FifJob()
         setShouldStop(true);
         wait();
     }
+    FifLocker::forget(&lock);
 }
 
 bool FifJob::start(const FifInput& request)
@@ -37,7 +39,7 @@ bool FifJob::start(const FifInput& request)
         model->removeRows(0, rows, QModelIndex());
     {
         // The thread is not running, but the lock keeps the counters' rule simple.
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         readFileCount = 0;
         fileHitCount = 0;
     }
@@ -49,13 +51,13 @@ bool FifJob::start(const FifInput& request)
 
 bool FifJob::shouldStop() const
 {
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return stopFlag;
 }
 
 void FifJob::setShouldStop(bool value)
 {
-    QWriteLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Write);
     stopFlag = value;
 }
 
@@ -66,25 +68,25 @@ void FifJob::stop()
 
 int FifJob::getReadFileCount() const
 {
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return readFileCount;
 }
 
 int FifJob::getFileHitCount() const
 {
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return fileHitCount;
 }
 
 void FifJob::incrementReadFileCount()
 {
-    QWriteLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Write);
     ++readFileCount;
 }
 
 void FifJob::incrementFileHitCount()
 {
-    QWriteLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Write);
     ++fileHitCount;
 }
 
