@@ -18,6 +18,17 @@ int clampToInt(qint64 value)
     return value > INT_MAX ? INT_MAX : int(value);
 }
 
+// A U+FEFF inside the text is a character like any other. QString::fromUtf8
+// and Qt's decoders drop one at the start of what they are given, which would
+// lose it from every line (or block) that begins with it; the file's own
+// byte-order mark is skipped before decoding starts.
+QString decodeUtf8(const char* bytes, qsizetype size)
+{
+    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless
+                                                     | QStringDecoder::Flag::ConvertInitialBom);
+    return decoder.decode(QByteArrayView(bytes, size));
+}
+
 bool isContinuationByte(char c)
 {
     return (uchar(c) & 0xC0) == 0x80;
@@ -32,7 +43,7 @@ qint64 utf8Length(const char* bytes, qint64 size)
         qint64 piece = qMin<qint64>(size, 1024 * 1024);
         while (piece < size && piece > 1 && isContinuationByte(bytes[piece]))
             --piece;
-        length += QString::fromUtf8(bytes, piece).size();
+        length += decodeUtf8(bytes, piece).size();
         bytes += piece;
         size -= piece;
     }
@@ -101,7 +112,8 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
             skippedChars += utf8Length(pendingTail.constData(), pendingTail.size());
             pendingTail.clear();
         }
-        if (matchLine(QString::fromUtf8(line), terminator, skippedChars, sink))
+        if (matchLine(decodeUtf8(line.constData(), line.size()), terminator, skippedChars,
+                      sink))
             hasHit = true;
         line.clear();
         skippedChars = 0;
@@ -168,7 +180,8 @@ bool FifLineScanner::scanUtf16(QIODevice& device, bool bigEndian, const MatchSin
 {
     bool hasHit = false;
     QStringDecoder decoder(bigEndian ? QStringDecoder::Utf16BE : QStringDecoder::Utf16LE,
-                           QStringDecoder::Flag::Stateless);
+                           QStringDecoder::Flag::Stateless
+                               | QStringDecoder::Flag::ConvertInitialBom);
     // Stateless would lose a code unit split across reads, so keep whole
     // code units: read an even number of bytes and carry an odd one over.
     QByteArray carry;
