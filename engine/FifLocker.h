@@ -32,7 +32,9 @@ public:
 
     FifLocker(QReadWriteLock* lock, Mode mode)
         : lock(lock)
+#ifdef FIF_TSAN
         , mode(mode)
+#endif
     {
 #ifdef FIF_TSAN
         __tsan_mutex_pre_lock(lock, flags());
@@ -77,7 +79,9 @@ private:
 #endif
 
     QReadWriteLock* lock;
+#ifdef FIF_TSAN
     Mode mode;
+#endif
 };
 
 } // namespace Orba
