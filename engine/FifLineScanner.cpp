@@ -55,6 +55,33 @@ qint64 utf8Length(const char* bytes, qint64 size)
 FifLineScanner::FifLineScanner(const QRegExp& expression)
     : rx(expression)
 {
+    const QRegExp::PatternSyntax syntax = rx.patternSyntax();
+    if ((syntax == QRegExp::RegExp || syntax == QRegExp::RegExp2) && rx.isValid()
+        && !rx.pattern().contains(QLatin1Char('^'))) {
+        anchored = QRegExp(QLatin1String("^(?:") + rx.pattern() + QLatin1Char(')'),
+                           rx.caseSensitivity(), syntax);
+        anchored.setMinimal(rx.isMinimal());
+        if (!anchored.isValid())
+            anchored = QRegExp();
+    }
+}
+
+int FifLineScanner::indexIn(const QString& text, const StopPoll& shouldStop)
+{
+    if (text.size() <= sliceThreshold || anchored.pattern().isEmpty())
+        return rx.indexIn(text, 0, QRegExp::CaretAtZero);
+    // With the caret at the offset, "^(?:P)" can only match at the offset,
+    // and does so exactly when P matches there: P holds no caret, and every
+    // other assertion sees the whole line as before.
+    for (int start = 0; start <= text.size(); ++start) {
+        if (shouldStop && shouldStop()) {
+            stopped = true;
+            return -1;
+        }
+        if (anchored.indexIn(text, start, QRegExp::CaretAtOffset) == start)
+            return start;
+    }
+    return -1;
 }
 
 bool FifLineScanner::scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop)
@@ -70,10 +97,10 @@ bool FifLineScanner::scan(QIODevice& device, const MatchSink& sink, const StopPo
 }
 
 bool FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars,
-                               const MatchSink& sink)
+                               const MatchSink& sink, const StopPoll& shouldStop)
 {
     bool matched = false;
-    const int position = rx.indexIn(text, 0, QRegExp::CaretAtZero);
+    const int position = indexIn(text, shouldStop);
     if (position >= 0) {
         matched = true;
         sink(Match{clampToInt(lineNumber), clampToInt(offset + position),
@@ -113,7 +140,7 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
             pendingTail.clear();
         }
         if (matchLine(decodeUtf8(line.constData(), line.size()), terminator, skippedChars,
-                      sink))
+                      sink, shouldStop))
             hasHit = true;
         line.clear();
         skippedChars = 0;
@@ -165,6 +192,8 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
                 return hasHit;
             addToLine(data, newline - data);
             finishLine(true);
+            if (stopped)
+                return hasHit;
             data = newline + 1;
         }
     }
@@ -197,7 +226,7 @@ bool FifLineScanner::scanUtf16(QIODevice& device, bool bigEndian, const MatchSin
                 terminator = 2;
             }
         }
-        if (matchLine(line, terminator, skippedChars, sink))
+        if (matchLine(line, terminator, skippedChars, sink, shouldStop))
             hasHit = true;
         line.clear();
         skippedChars = 0;
@@ -229,6 +258,8 @@ bool FifLineScanner::scanUtf16(QIODevice& device, bool bigEndian, const MatchSin
             if (lineNumber % pollInterval == 0 && shouldStop && shouldStop())
                 return hasHit;
             finishLine(true);
+            if (stopped)
+                return hasHit;
             start = newline + 1;
         }
     }

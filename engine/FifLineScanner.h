@@ -40,6 +40,13 @@ public:
     // `maxLineBytes` only; the numbers and offsets of later lines stay true.
     static constexpr qint64 maxLineBytes = 16 * 1024 * 1024;
     static constexpr int pollInterval = 100;
+    // Qt's regular-expression engine takes time quadratic in the line's
+    // length for many patterns (a*b, .*x, nested repetition) when a line
+    // holds no match. Lines longer than this are therefore matched one
+    // start position at a time, with a stop poll before each, so that a
+    // stop request is noticed within one position's attempt. The result
+    // is the same leftmost match; see indexIn().
+    static constexpr int sliceThreshold = 1024;
 
     // Returns whether any line matched.
     bool scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
@@ -50,9 +57,17 @@ private:
                    const StopPoll& shouldStop);
     // Matches one line and advances the counters past it.
     bool matchLine(const QString& text, int terminatorLength, qint64 extraChars,
-                   const MatchSink& sink);
+                   const MatchSink& sink, const StopPoll& shouldStop);
+    // The first match in `text`, as rx.indexIn() with QRegExp::CaretAtZero
+    // finds it; sets `stopped` when a stop request ends the search first.
+    int indexIn(const QString& text, const StopPoll& shouldStop);
 
     QRegExp rx;
+    // rx anchored at the offset searched from, when that gives the same
+    // matches: a regular expression without any '^', which could otherwise
+    // mean the start of the line. Invalid when lines are matched whole.
+    QRegExp anchored;
+    bool stopped = false;
     qint64 lineNumber = 1;
     qint64 offset = 0;
     qint64 rawOffset = 0;
