@@ -88,17 +88,25 @@ bool FifWorker::isTextFile(const QFileInfo& info)
     if (!file.open(QIODevice::ReadOnly))
         return false;
     QTextStream stream(&file);
-    bool control = false;
-    for (int lines = 0; lines < 20 && !control && !stream.atEnd(); ++lines) {
-        const QString line = stream.readLine();
-        for (const QChar c : line) {
-            if (c.category() == QChar::Other_Control && !c.isSpace()) {
-                control = true;
-                break;
+    // Read in pieces rather than whole lines: a huge line (a sparse file of
+    // zero bytes, say) is judged by its first characters instead of being
+    // read and held whole. The characters examined are the same: those of
+    // the first 20 lines.
+    int lines = 0;
+    while (lines < 20 && !stream.atEnd()) {
+        const QString piece = stream.read(4096);
+        if (piece.isEmpty())
+            break;
+        for (const QChar c : piece) {
+            if (c == QLatin1Char('\n')) {
+                if (++lines == 20)
+                    break;
+            } else if (c.category() == QChar::Other_Control && !c.isSpace()) {
+                return false;
             }
         }
     }
-    return !control;
+    return true;
 }
 
 void FifWorker::searchFile(const QString& path)
