@@ -11,7 +11,8 @@ file(GLOB FIF_UI_SOURCES CONFIGURE_DEPENDS
 set(FIF_PRIVATE_HEADERS
     ${PROJECT_SOURCE_DIR}/engine/FifWorker.h
     ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h
-    ${PROJECT_SOURCE_DIR}/engine/FifLocker.h)
+    ${PROJECT_SOURCE_DIR}/engine/FifLocker.h
+    ${PROJECT_SOURCE_DIR}/engine/FifHandOff.h)
 
 add_library(FindInFiles SHARED ${FIF_ENGINE_SOURCES} ${FIF_UI_SOURCES})
 add_library(FindInFiles::FindInFiles ALIAS FindInFiles)

@@ -1,5 +1,6 @@
 #include "FifJob.h"
 
+#include "FifHandOff.h"
 #include "FifHitsModel.h"
 #include "FifLocker.h"
 #include "FifManager.h"
@@ -130,6 +131,7 @@ MainWindow* FifJob::getMainWindow() const
 
 void FifJob::appendHit(const FifHit& hit)
 {
+    FifHandOff::received(this);
     if (!hit.isValid())
         return;
     FifHitsModel* model = getHitsModel();
@@ -140,6 +142,7 @@ void FifJob::appendHit(const FifHit& hit)
 
 void FifJob::appendHits(const FifHitList& hits)
 {
+    FifHandOff::received(this);
     int count = 0;
     for (const FifHit& hit : hits)
         count += hit.isValid() ? 1 : 0;
