@@ -25,6 +25,31 @@ QString wordBounded(const QString& pattern)
     return QLatin1String("\\b(") + pattern + QLatin1String(")\\b");
 }
 
+// A stored value counts only when Qt can read it as the field's type; one of
+// another kind (a list where a flag belongs, text where a number belongs) is
+// passed over like a missing one.
+bool readBool(const QVariant& value, bool* result)
+{
+    if (value.isNull())
+        return false;
+    QVariant converted = value;
+    if (!converted.convert(QMetaType::fromType<bool>()))
+        return false;
+    *result = converted.toBool();
+    return true;
+}
+
+bool readInt(const QVariant& value, int* result)
+{
+    if (value.isNull())
+        return false;
+    bool ok = false;
+    const int number = value.toInt(&ok);
+    if (ok)
+        *result = number;
+    return ok;
+}
+
 } // namespace
 
 FifInput::FifInput(const QString& filterText)
@@ -126,18 +151,16 @@ void FifInput::setContents(Settings* settings)
     if (!storedFilter.isEmpty())
         filter = storedFilter;
 
-    const QVariant storedCase = settings->getValue(keys.getMatchCaseKeyPath(), QVariant());
-    if (!storedCase.isNull())
-        matchCase = storedCase.toBool() ? Qt::CaseSensitive : Qt::CaseInsensitive;
+    bool flag = false;
+    if (readBool(settings->getValue(keys.getMatchCaseKeyPath(), QVariant()), &flag))
+        matchCase = flag ? Qt::CaseSensitive : Qt::CaseInsensitive;
+    if (readBool(settings->getValue(keys.getMatchWordKeyPath(), QVariant()), &flag))
+        matchWord = flag;
 
-    const QVariant storedWord = settings->getValue(keys.getMatchWordKeyPath(), QVariant());
-    if (!storedWord.isNull())
-        matchWord = storedWord.toBool();
-
-    const QVariant storedType = settings->getValue(keys.getMatchTypeKeyPath(), QVariant());
-    if (!storedType.isNull()) {
+    int storedType = 0;
+    if (readInt(settings->getValue(keys.getMatchTypeKeyPath(), QVariant()), &storedType)) {
         // The store keeps RegExp (0) where a request carries RegExp2.
-        switch (storedType.toInt()) {
+        switch (storedType) {
         case QRegExp::RegExp:
             matchType = QRegExp::RegExp2;
             break;
@@ -152,10 +175,8 @@ void FifInput::setContents(Settings* settings)
         }
     }
 
-    const QVariant storedSub =
-        settings->getValue(keys.getIncludeSubFolderKeyPath(), QVariant());
-    if (!storedSub.isNull())
-        includeSubFolders = storedSub.toBool();
+    if (readBool(settings->getValue(keys.getIncludeSubFolderKeyPath(), QVariant()), &flag))
+        includeSubFolders = flag;
 }
 
 } // namespace Orba

@@ -53,8 +53,11 @@ FifJob* FifManager::getJob(int index) const
 {
     if (index < 0)
         return nullptr;
-    if (index < jobs.size())
+    if (index < jobs.size()) {
+        if (!jobs.at(index))
+            jobs[index] = new FifJob(const_cast<FifManager*>(this));
         return jobs.at(index);
+    }
     auto* job = new FifJob(const_cast<FifManager*>(this));
     jobs.append(job);
     return job;

@@ -5,6 +5,7 @@
 #include <QList>
 #include <QMap>
 #include <QObject>
+#include <QPointer>
 #include <QStringList>
 
 namespace Gui {
@@ -31,7 +32,8 @@ public:
 
     int getJobCount() const;
     // The job in slot `index`; past the last slot exactly one new slot is
-    // added and its job returned. Null for a negative index.
+    // added and its job returned. Null for a negative index. A slot whose
+    // job has been destroyed gets a new job.
     FifJob* getJob(int index) const;
     // Puts `job` into slot `index` (1 or more) and returns the job that was
     // there; slot 0 cannot be replaced. Ownership does not change.
@@ -45,7 +47,8 @@ public:
 private:
     static QMap<MainWindow*, FifManager*>* s_wndToMrgMap;
 
-    mutable QList<FifJob*> jobs;
+    // Guarded: a job put in by replaceJob() may be deleted by its owner.
+    mutable QList<QPointer<FifJob>> jobs;
     QStringList filters;
 };
 

@@ -14,7 +14,7 @@ ActionHandler::~ActionHandler() = default;
 
 void ActionHandler::addAction(QAction* action)
 {
-    if (!action || actions.contains(action))
+    if (!action || getActions().contains(action))
         return;
     actions.append(action);
     connect(action, &QAction::triggered, this, &ActionHandler::onTriggered);
@@ -23,7 +23,7 @@ void ActionHandler::addAction(QAction* action)
 
 void ActionHandler::removeAction(QAction* action)
 {
-    if (!actions.removeAll(action))
+    if (!action || !actions.removeAll(action))
         return;
     disconnect(action, nullptr, this, nullptr);
 }
@@ -39,19 +39,29 @@ bool ActionHandler::doAction()
 
 QList<QAction*> ActionHandler::getActions() const
 {
-    return actions;
+    QList<QAction*> list;
+    for (const QPointer<QAction>& action : actions) {
+        if (action)
+            list.append(action);
+    }
+    return list;
 }
 
 void ActionHandler::updateActions()
 {
-    const QList<QAction*> current = actions;
-    for (QAction* action : current)
-        updateAction(action);
+    // updateAction() may add, remove or delete actions.
+    const QList<QAction*> current = getActions();
+    for (QAction* action : current) {
+        if (actions.contains(action))
+            updateAction(action);
+    }
 }
 
-void ActionHandler::onDestroyed(QObject* object)
+void ActionHandler::onDestroyed(QObject* /*object*/)
 {
-    actions.removeAll(static_cast<QAction*>(object));
+    // The object is no longer an action here, so it is not cast back to one;
+    // its guard already reads null.
+    actions.removeAll(QPointer<QAction>());
 }
 
 void ActionHandler::onTriggered()

@@ -4,6 +4,7 @@
 
 #include <QList>
 #include <QObject>
+#include <QPointer>
 
 class QAction;
 
@@ -37,7 +38,8 @@ private slots:
     void onTriggered();
 
 private:
-    QList<QAction*> actions;
+    // Guarded, so that an action is never touched once it is gone.
+    QList<QPointer<QAction>> actions;
 };
 
 } // namespace Orba

@@ -27,8 +27,14 @@ Settings* ApplicationBase::getSettings() const
     if (!defaultSettings) {
         const QString folder =
             QStandardPaths::writableLocation(QStandardPaths::AppConfigLocation);
-        QDir().mkpath(folder);
-        defaultSettings = std::make_unique<Settings>(folder + QStringLiteral("/settings.ini"));
+        // Without a usable folder the settings last for this run only; the
+        // store's isPersistent() tells so.
+        if (folder.isEmpty()) {
+            defaultSettings = std::make_unique<Settings>();
+        } else {
+            QDir().mkpath(folder);
+            defaultSettings = std::make_unique<Settings>(folder + QStringLiteral("/settings.ini"));
+        }
     }
     return defaultSettings.get();
 }

@@ -81,7 +81,10 @@ void Dialog::restoreDialogState()
 
 QString Dialog::getGeometryKey() const
 {
-    return QStringLiteral("Dialogs/%1/Geometry").arg(objectName());
+    // A dialog without a name still gets a key of its own kind.
+    const QString name = objectName().isEmpty() ? QString::fromLatin1(metaObject()->className())
+                                                : objectName();
+    return QStringLiteral("Dialogs/%1/Geometry").arg(name);
 }
 
 void Dialog::saveGeometryToRegistry()

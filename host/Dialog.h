@@ -36,7 +36,8 @@ public:
     virtual void help();
     virtual void saveDialogState();
     virtual void restoreDialogState();
-    // "Dialogs/<object name>/Geometry"
+    // "Dialogs/<object name>/Geometry", the class name standing in for an
+    // empty object name.
     virtual QString getGeometryKey() const;
     virtual void saveGeometryToRegistry();
     virtual void restoreGeometryFromRegistry();

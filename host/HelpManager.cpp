@@ -30,10 +30,11 @@ void HelpManager::setHelpForWidget(QWidget* widget, const Port::StringBase<char>
 {
     if (!widget)
         return;
+    if (!topics.contains(widget)) {
+        widget->installEventFilter(this);
+        connect(widget, &QObject::destroyed, this, [this](QObject* gone) { topics.remove(gone); });
+    }
     topics.insert(widget, String::convert(topic));
-    widget->installEventFilter(this);
-    connect(widget, &QObject::destroyed, this,
-            [this](QObject* gone) { topics.remove(static_cast<QWidget*>(gone)); });
 }
 
 QString HelpManager::getHelpTopic(const QWidget* widget) const
@@ -69,7 +70,7 @@ bool HelpManager::eventFilter(QObject* watched, QEvent* event)
 {
     if (event->type() == QEvent::KeyPress
         && static_cast<QKeyEvent*>(event)->key() == Qt::Key_F1) {
-        const QString topic = topics.value(static_cast<QWidget*>(watched));
+        const QString topic = topics.value(watched);
         if (!topic.isEmpty() && showHelp(topic))
             return true;
     }

@@ -41,7 +41,7 @@ protected:
 private:
     HelpManager();
 
-    QHash<const QWidget*, QString> topics;
+    QHash<const QObject*, QString> topics;
     QPointer<QTextBrowser> window;
 };
 

@@ -50,8 +50,10 @@ bool ImExportDialog::writeText(const QAbstractItemModel& model, const QString& f
     for (int row = 0; row < rows; ++row) {
         QByteArray line = model.data(model.index(row, 0)).toString().toUtf8();
         line += '\n';
-        if (file.write(line) != line.size())
+        if (file.write(line) != line.size()) {
+            file.cancelWriting(); // commit() then fails and keeps the old file
             break;
+        }
     }
     if (!file.commit()) {
         if (error)

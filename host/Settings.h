@@ -17,6 +17,11 @@ namespace Orba {
 // With a file name the values live in an INI file and keep their types
 // (string lists, bools, ints) across runs; without one they live in memory
 // only, which is what tests want.
+//
+// A store never fails its caller. A file that cannot be read is left alone
+// and the store keeps its values in memory; a file that is damaged is kept
+// beside the new one as "<name>.corrupt" and what could be read of it is
+// carried over. isPersistent() tells whether values reach the file.
 class ORBA_HOST_EXPORT Settings
 {
 public:
@@ -36,13 +41,20 @@ public:
     // The INI file's name, empty for a memory store.
     QString getFileName() const;
 
-    // False once the file could not be read or written; values set since
-    // then are kept for this run only.
+    // Whether values set now will be there in the next run: false for a
+    // memory store, for a file that could not be read, and once the file
+    // or its folder could not be written. Values set in the meantime are
+    // still read back for the rest of this run.
     bool isPersistent() const;
 
 private:
+    void openFile();
+    void replaceDamagedFile();
+
+    QString fileName;
     std::unique_ptr<QSettings> file;
     QHash<QString, QVariant> memory;
+    bool writable = false;
 };
 
 } // namespace Orba

@@ -1,0 +1,36 @@
+# Installs the project into a staging prefix, builds the consumer project
+# against it and runs the consumer on a small tree.
+foreach(var BINARY_DIR SOURCE_DIR WORK_DIR)
+  if(NOT DEFINED ${var})
+    message(FATAL_ERROR "${var} not set")
+  endif()
+endforeach()
+
+file(REMOVE_RECURSE ${WORK_DIR})
+set(prefix ${WORK_DIR}/prefix)
+execute_process(COMMAND ${CMAKE_COMMAND} --install ${BINARY_DIR} --prefix ${prefix}
+                RESULT_VARIABLE result OUTPUT_QUIET)
+if(result)
+  message(FATAL_ERROR "install failed: ${result}")
+endif()
+# The staged package must be relocatable: move it before use.
+file(RENAME ${prefix} ${WORK_DIR}/moved)
+set(prefix ${WORK_DIR}/moved)
+
+execute_process(COMMAND ${CMAKE_COMMAND} -S ${SOURCE_DIR}/tests/package/consumer
+                        -B ${WORK_DIR}/build -G Ninja -DCMAKE_PREFIX_PATH=${prefix}
+                RESULT_VARIABLE result)
+if(result)
+  message(FATAL_ERROR "configuring the consumer failed")
+endif()
+execute_process(COMMAND ${CMAKE_COMMAND} --build ${WORK_DIR}/build RESULT_VARIABLE result)
+if(result)
+  message(FATAL_ERROR "building the consumer failed")
+endif()
+
+file(WRITE ${WORK_DIR}/tree/notes.txt "first line\nthe needle is here\n")
+execute_process(COMMAND ${WORK_DIR}/build/consumer needle ${WORK_DIR}/tree
+                RESULT_VARIABLE result OUTPUT_VARIABLE output)
+if(result OR NOT output MATCHES "notes.txt \\(2\\): the needle is here")
+  message(FATAL_ERROR "consumer gave ${result}: ${output}")
+endif()
