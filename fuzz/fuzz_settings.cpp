@@ -110,23 +110,31 @@ FifInput expected(Settings& store, const FifInput& before)
     const QVariant filter = store.getValue(keys.getFilterKeyPath());
     if (!filter.isNull() && !filter.toString().isEmpty())
         want.filter = filter.toString();
-    const QVariant matchCase = store.getValue(keys.getMatchCaseKeyPath());
-    if (!matchCase.isNull())
-        want.matchCase = matchCase.toBool() ? Qt::CaseSensitive : Qt::CaseInsensitive;
-    const QVariant word = store.getValue(keys.getMatchWordKeyPath());
-    if (!word.isNull())
-        want.matchWord = word.toBool();
+    // A flag or number counts only when Qt can read the stored value as
+    // one; anything else is passed over like a missing value.
+    auto flag = [](const QVariant& v, bool* out) {
+        QVariant converted = v;
+        if (v.isNull() || !converted.convert(QMetaType::fromType<bool>()))
+            return false;
+        *out = converted.toBool();
+        return true;
+    };
+    bool value = false;
+    if (flag(store.getValue(keys.getMatchCaseKeyPath()), &value))
+        want.matchCase = value ? Qt::CaseSensitive : Qt::CaseInsensitive;
+    if (flag(store.getValue(keys.getMatchWordKeyPath()), &value))
+        want.matchWord = value;
     const QVariant type = store.getValue(keys.getMatchTypeKeyPath());
-    if (!type.isNull()) {
-        const int stored = type.toInt();
+    bool isNumber = false;
+    const int stored = type.isNull() ? -1 : type.toInt(&isNumber);
+    if (isNumber) {
         if (stored == 0)
             want.matchType = QRegExp::RegExp2;
         else if (stored == 1 || stored == 2)
             want.matchType = stored;
     }
-    const QVariant sub = store.getValue(keys.getIncludeSubFolderKeyPath());
-    if (!sub.isNull())
-        want.includeSubFolders = sub.toBool();
+    if (flag(store.getValue(keys.getIncludeSubFolderKeyPath()), &value))
+        want.includeSubFolders = value;
     return want;
 }
 

@@ -5,6 +5,8 @@
 #include "FifHitsModel.h"
 #include "FifJob.h"
 #include "FifManager.h"
+#include "FifSettings.h"
+#include "Settings.h"
 #include "TestTree.h"
 
 #include <QElapsedTimer>
@@ -62,6 +64,8 @@ private slots:
     void longLinesMatchAsBefore();
     void pathologicalPatternStops_data();
     void pathologicalPatternStops();
+    void damagedSettingsStore_data();
+    void damagedSettingsStore();
 
 private:
     FifManager manager;
@@ -519,6 +523,46 @@ void tst_FifHostile::pathologicalPatternStops()
     QVERIFY(!job->isRunning());
     QFETCH(int, fullHits);
     QVERIFY(job->getLineHitCount() <= fullHits);
+}
+
+// A damaged or unwritable settings file costs the history, not the search:
+// the request keeps what it had for whatever cannot be read, and runs.
+void tst_FifHostile::damagedSettingsStore_data()
+{
+    QTest::addColumn<QByteArray>("ini");
+    QTest::newRow("garbage") << QByteArray("\xFF\xFE[[[\n=\n\\\0\x01", 11);
+    QTest::newRow("wrong kinds")
+        << QByteArray("[FindBar]\nMatchType=@Variant(\\0\\0\\0\\x7f\\0\\0\\0\\x1cQ)\n"
+                      "MatchCase=@ByteArray(\\xff)\nFind%20what=@Rect(1 2 3 4)\n"
+                      "[ValueTypes]\nFindBar|MatchType=39\nFindBar|MatchCase=1024\n");
+}
+
+void tst_FifHostile::damagedSettingsStore()
+{
+    QFETCH(QByteArray, ini);
+    QTemporaryDir dir;
+    QVERIFY(TestTree::write(dir.path(), "config.ini", ini));
+    QVERIFY(TestTree::write(dir.path(), "tree/a.txt", "needle\n"));
+    // A file where the folder of the second store should be: never writable.
+    QVERIFY(TestTree::write(dir.path(), "blocked", "x"));
+    Settings damaged(dir.path() + "/config.ini");
+    Settings unwritable(dir.path() + "/blocked/config.ini");
+    unwritable.setValue(FifSettings().getFindWhatKeyPath(), QStringList{"needle"});
+    unwritable.sync();
+    QVERIFY(!unwritable.isPersistent());
+    for (Settings* store : {&damaged, &unwritable}) {
+        FifInput request;
+        request.setContents(store);
+        QVERIFY(request.matchCase == Qt::CaseSensitive || request.matchCase == Qt::CaseInsensitive);
+        QVERIFY(request.matchType == QRegExp::FixedString || request.matchType == QRegExp::Wildcard
+                || request.matchType == QRegExp::RegExp2);
+        request.what = QStringLiteral("needle");
+        request.matchType = QRegExp::FixedString;
+        request.where = dir.path() + "/tree";
+        FifJob* job = manager.getJob(0);
+        FIF_RUN_JOB(job, request, 30000);
+        QCOMPARE(job->getLineHitCount(), 1);
+    }
 }
 
 QTEST_MAIN(tst_FifHostile)
