@@ -59,7 +59,7 @@ QByteArray contents(int index)
 }
 
 // Runs one search; `stopAfterFiles` < 0 lets it complete, 0 stops it before
-// the thread starts, n stops it once the n-th searched file is reported.
+// it starts, n stops it once the n-th searched file is reported.
 // Returns the files reported by searching().
 QStringList runOnce(FifJob* job, const FifInput& request, int stopAfterFiles, bool* ended)
 {
@@ -74,10 +74,12 @@ QStringList runOnce(FifJob* job, const FifInput& request, int stopAfterFiles, bo
     });
     QObject::connect(job, &QThread::finished, &loop, [&] { *ended = true; loop.quit(); },
                      Qt::QueuedConnection);
-    if (!job->start(request))
-        return searched;
+    // A stop requested while no search runs stays set, and the next search
+    // ends at its first poll.
     if (stopAfterFiles == 0)
         job->stop();
+    if (!job->start(request))
+        return searched;
     QTimer::singleShot(300000, &loop, &QEventLoop::quit);
     if (!*ended)
         loop.exec();
@@ -177,13 +179,15 @@ void tst_FifStress::startStopCycles()
             QVERIFY(rows.isEmpty());
         } else {
             QVERIFY(searched.size() >= stopAfter);
-            QVERIFY2(searched.size() < fileCount, "a stop request ends the walk early");
+            // The request may come after the walk's end; then it is complete.
+            if (searched.size() == fileCount)
+                QCOMPARE(rows.size(), full.size());
         }
-        stoppedRuns += stopAfter >= 0 ? 1 : 0;
+        stoppedRuns += searched.size() < fileCount ? 1 : 0;
         filesChecked += searched.size();
         hitsChecked += rows.size();
     }
-    qInfo("start/stop: %d cycles (%d stopped) after one full run; %lld files and %lld hits checked",
+    qInfo("start/stop: %d cycles (%d ended early) after one full run; %lld files and %lld hits checked",
           cycles, stoppedRuns, filesChecked, hitsChecked);
 }
 
