@@ -11,22 +11,15 @@ namespace Orba {
 
 namespace {
 
-constexpr qint64 blockSize = 256 * 1024;
+// Bytes of an over-long line that are held back before they are counted,
+// so that the "\r" of a terminator is still at hand.
+constexpr int heldBack = 4;
+// No UTF-8 sequence has more continuation bytes than this.
+constexpr int maxContinuation = 3;
 
 int clampToInt(qint64 value)
 {
     return value > INT_MAX ? INT_MAX : int(value);
-}
-
-// A U+FEFF inside the text is a character like any other. QString::fromUtf8
-// and Qt's decoders drop one at the start of what they are given, which would
-// lose it from every line (or block) that begins with it; the file's own
-// byte-order mark is skipped before decoding starts.
-QString decodeUtf8(const char* bytes, qsizetype size)
-{
-    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless
-                                                     | QStringDecoder::Flag::ConvertInitialBom);
-    return decoder.decode(QByteArrayView(bytes, size));
 }
 
 bool isContinuationByte(char c)
@@ -34,16 +27,38 @@ bool isContinuationByte(char c)
     return (uchar(c) & 0xC0) == 0x80;
 }
 
-// Characters that `bytes` decode to. Long runs are decoded in pieces cut
-// before a byte that starts a sequence, so no sequence is split.
-qint64 utf8Length(const char* bytes, qint64 size)
+// A place at or just before `cut` (0 < cut < size) where `bytes` can be
+// split so that decoding the two parts gives what decoding them together
+// does. An undecodable byte always becomes one replacement character, so
+// the only place that is not safe is inside a well-formed sequence: cut
+// before a byte that is not a continuation byte, or where no sequence lead
+// is close enough to reach.
+qsizetype safeCut(const char* bytes, qsizetype cut)
+{
+    for (qsizetype p = cut; p >= 0 && p >= cut - maxContinuation; --p) {
+        if (!isContinuationByte(bytes[p]))
+            return p;
+    }
+    return cut;
+}
+
+QString decodeUtf8(QStringDecoder& decoder, const char* bytes, qsizetype size)
+{
+    return decoder.decode(QByteArrayView(bytes, size));
+}
+
+// Characters that `bytes` decode to, decoded in pieces of bounded size.
+qint64 utf8Length(QStringDecoder& decoder, const char* bytes, qsizetype size)
 {
     qint64 length = 0;
     while (size > 0) {
-        qint64 piece = qMin<qint64>(size, 1024 * 1024);
-        while (piece < size && piece > 1 && isContinuationByte(bytes[piece]))
-            --piece;
-        length += decodeUtf8(bytes, piece).size();
+        qsizetype piece = size;
+        if (piece > 1024 * 1024) {
+            piece = safeCut(bytes, 1024 * 1024);
+            if (piece == 0)
+                piece = 1024 * 1024;
+        }
+        length += decodeUtf8(decoder, bytes, piece).size();
         bytes += piece;
         size -= piece;
     }
@@ -52,8 +67,10 @@ qint64 utf8Length(const char* bytes, qint64 size)
 
 } // namespace
 
-FifLineScanner::FifLineScanner(const QRegExp& expression)
+FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint64 block)
     : rx(expression)
+    , maxLineBytes(qMax<qint64>(maxBytes, 1))
+    , blockSize(qMax<qint64>(block, 1))
 {
     const QRegExp::PatternSyntax syntax = rx.patternSyntax();
     if ((syntax == QRegExp::RegExp || syntax == QRegExp::RegExp2) && rx.isValid()
@@ -86,13 +103,26 @@ int FifLineScanner::indexIn(const QString& text, const StopPoll& shouldStop)
 
 bool FifLineScanner::scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop)
 {
-    const QByteArray head = device.peek(3);
-    if (head.startsWith("\xFF\xFE") || head.startsWith("\xFE\xFF")) {
-        device.skip(2);
-        return scanUtf16(device, head.at(0) == '\xFE', sink, shouldStop);
+    // The same byte-order-mark detection as QTextStream's, so that the text
+    // test and the scan read a file alike.
+    const auto encoding = QStringConverter::encodingForData(device.peek(4));
+    if (encoding) {
+        switch (*encoding) {
+        case QStringConverter::Utf16LE:
+        case QStringConverter::Utf16BE:
+            device.skip(2);
+            return scanDecoded(device, *encoding, 2, sink, shouldStop);
+        case QStringConverter::Utf32LE:
+        case QStringConverter::Utf32BE:
+            device.skip(4);
+            return scanDecoded(device, *encoding, 4, sink, shouldStop);
+        case QStringConverter::Utf8:
+            device.skip(3);
+            break;
+        default:
+            break;
+        }
     }
-    if (head.startsWith("\xEF\xBB\xBF"))
-        device.skip(3);
     return scanUtf8(device, sink, shouldStop);
 }
 
@@ -117,66 +147,82 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
                               const StopPoll& shouldStop)
 {
     bool hasHit = false;
-    QByteArray block;
+    // Stateless, so that pieces decode alike wherever they are cut; and,
+    // unlike QString::fromUtf8(), keeping a U+FEFF at the start of a line:
+    // only the one that starts the file is a byte-order mark.
+    QStringDecoder decoder(QStringDecoder::Utf8,
+                           QStringDecoder::Flag::Stateless
+                               | QStringDecoder::Flag::ConvertInitialBom);
     QByteArray line;          // the kept part of the line being read
-    qint64 skippedChars = 0;  // characters of an overlong line beyond the kept part
-    QByteArray pendingTail;   // bytes of an overlong line not yet counted
+    bool overlong = false;    // the line has outgrown the kept part
+    QByteArray tail;          // bytes beyond the kept part not yet counted
+    qint64 skippedChars = 0;  // characters beyond the kept part already counted
+    bool endsWithCR = false;  // the last byte of the line so far is "\r"
+
+    auto stopRequested = [&] { return shouldStop && shouldStop(); };
 
     auto finishLine = [&](bool hasNewline) {
-        int terminator = 0;
-        if (hasNewline) {
-            terminator = 1;
-            // The "\r" of "\r\n" may sit in the kept part or in the tail.
-            if (!pendingTail.isEmpty() && pendingTail.endsWith('\r')) {
-                pendingTail.chop(1);
-                terminator = 2;
-            } else if (pendingTail.isEmpty() && skippedChars == 0 && line.endsWith('\r')) {
+        int terminator = hasNewline ? 1 : 0;
+        if (hasNewline && endsWithCR) {
+            terminator = 2;
+            // An over-long line always holds its last bytes in the tail.
+            if (overlong)
+                tail.chop(1);
+            else
                 line.chop(1);
-                terminator = 2;
+        }
+        if (!tail.isEmpty())
+            skippedChars += utf8Length(decoder, tail.constData(), tail.size());
+        if (matchLine(decodeUtf8(decoder, line.constData(), line.size()), terminator,
+                      skippedChars, sink, shouldStop))
+            hasHit = true;
+        // Keep the buffers' memory for the next line.
+        line.resize(0);
+        tail.resize(0);
+        overlong = false;
+        skippedChars = 0;
+        endsWithCR = false;
+    };
+
+    auto addToLine = [&](const char* bytes, qint64 size) {
+        if (size <= 0)
+            return;
+        endsWithCR = bytes[size - 1] == '\r';
+        if (!overlong) {
+            const qint64 room = maxLineBytes - line.size();
+            if (size <= room) {
+                line.append(bytes, size);
+                return;
+            }
+            line.append(bytes, room);
+            bytes += room;
+            size -= room;
+            overlong = true;
+            // Where the kept part ends, the decoding must not change.
+            const QByteArray around = line.right(maxContinuation) + bytes[0];
+            const qsizetype back = around.size() - 1 - safeCut(around.constData(), around.size() - 1);
+            tail = line.right(back);
+            line.chop(back);
+        }
+        tail.append(bytes, size);
+        // Count the tail in pieces; the last bytes stay, as they may be the
+        // "\r" of the terminator.
+        if (tail.size() > blockSize + heldBack) {
+            const qsizetype cut = safeCut(tail.constData(), tail.size() - heldBack);
+            if (cut > 0) {
+                skippedChars += utf8Length(decoder, tail.constData(), cut);
+                tail.remove(0, cut);
             }
         }
-        if (!pendingTail.isEmpty()) {
-            skippedChars += utf8Length(pendingTail.constData(), pendingTail.size());
-            pendingTail.clear();
-        }
-        if (matchLine(decodeUtf8(line.constData(), line.size()), terminator, skippedChars,
-                      sink, shouldStop))
-            hasHit = true;
-        line.clear();
-        skippedChars = 0;
     };
 
-    // Adds bytes of the current line, keeping at most maxLineBytes of them.
-    auto addToLine = [&](const char* bytes, qint64 size) {
-        const qint64 room = maxLineBytes - line.size();
-        if (skippedChars == 0 && pendingTail.isEmpty() && size <= room) {
-            line.append(bytes, size);
-            return;
-        }
-        if (skippedChars == 0 && pendingTail.isEmpty()) {
-            // Cut before a byte that starts a sequence, so the kept part
-            // decodes as it would within the whole line.
-            qint64 keep = room;
-            while (keep > 0 && isContinuationByte(bytes[keep]))
-                --keep;
-            line.append(bytes, keep);
-            bytes += keep;
-            size -= keep;
-        }
-        pendingTail.append(bytes, size);
-        // Count the tail in pieces; keep the last bytes back, as they may
-        // be the "\r" of the terminator or part of a sequence.
-        if (pendingTail.size() > blockSize) {
-            qint64 cut = pendingTail.size() - 8;
-            while (cut > 0 && isContinuationByte(pendingTail.at(cut)))
-                --cut;
-            skippedChars += utf8Length(pendingTail.constData(), cut);
-            pendingTail.remove(0, cut);
-        }
-    };
-
+    bool firstBlock = true;
     while (true) {
-        block = device.read(blockSize);
+        // A single line may span many blocks; a stop must not wait for its end.
+        if (!firstBlock && stopRequested())
+            return hasHit;
+        firstBlock = false;
+        const QByteArray block = device.read(blockSize);
         if (block.isEmpty())
             break;
         const char* data = block.constData();
@@ -188,7 +234,7 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
                 addToLine(data, end - data);
                 break;
             }
-            if (lineNumber % pollInterval == 0 && shouldStop && shouldStop())
+            if (lineNumber % pollInterval == 0 && stopRequested())
                 return hasHit;
             addToLine(data, newline - data);
             finishLine(true);
@@ -197,78 +243,113 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
             data = newline + 1;
         }
     }
-    if (!line.isEmpty() || !pendingTail.isEmpty() || skippedChars > 0) {
-        if (!(lineNumber % pollInterval == 0 && shouldStop && shouldStop()))
-            finishLine(false);
+    if (!line.isEmpty() || overlong) {
+        if (lineNumber % pollInterval == 0 && stopRequested())
+            return hasHit;
+        finishLine(false);
     }
     return hasHit;
 }
 
-bool FifLineScanner::scanUtf16(QIODevice& device, bool bigEndian, const MatchSink& sink,
-                               const StopPoll& shouldStop)
+bool FifLineScanner::scanDecoded(QIODevice& device, QStringConverter::Encoding encoding,
+                                 int unitBytes, const MatchSink& sink,
+                                 const StopPoll& shouldStop)
 {
     bool hasHit = false;
-    QStringDecoder decoder(bigEndian ? QStringDecoder::Utf16BE : QStringDecoder::Utf16LE,
-                           QStringDecoder::Flag::Stateless
-                               | QStringDecoder::Flag::ConvertInitialBom);
-    // Stateless would lose a code unit split across reads, so keep whole
-    // code units: read an even number of bytes and carry an odd one over.
+    // The byte-order mark has been skipped; a U+FEFF that follows it, or that
+    // starts a later block, is text.
+    QStringDecoder decoder(encoding, QStringDecoder::Flag::Stateless
+                                         | QStringDecoder::Flag::ConvertInitialBom);
+    // Stateless decoding would spoil a code unit split between reads, so
+    // only whole code units are decoded and the rest is carried over.
     QByteArray carry;
     QString line;
+    bool overlong = false;
     qint64 skippedChars = 0;
+    bool endsWithCR = false;
+    const qint64 maxLineChars = qMax<qint64>(maxLineBytes / 2, 1);
+
+    auto stopRequested = [&] { return shouldStop && shouldStop(); };
 
     auto finishLine = [&](bool hasNewline) {
-        int terminator = 0;
-        if (hasNewline) {
-            terminator = 1;
-            if (line.endsWith(QLatin1Char('\r')) && skippedChars == 0) {
+        int terminator = hasNewline ? 1 : 0;
+        if (hasNewline && endsWithCR) {
+            terminator = 2;
+            // Once a line is over-long, its last characters are skipped ones.
+            if (overlong)
+                --skippedChars;
+            else
                 line.chop(1);
-                terminator = 2;
-            }
         }
         if (matchLine(line, terminator, skippedChars, sink, shouldStop))
             hasHit = true;
         line.clear();
+        overlong = false;
         skippedChars = 0;
+        endsWithCR = false;
     };
 
-    const qint64 maxLineChars = maxLineBytes / 2;
-    while (true) {
-        QByteArray bytes = carry + device.read(blockSize);
-        if (bytes.isEmpty())
-            break;
-        carry.clear();
-        if (bytes.size() % 2) {
-            carry = bytes.right(1);
-            bytes.chop(1);
+    auto addToLine = [&](QStringView chars) {
+        if (chars.isEmpty())
+            return;
+        endsWithCR = chars.back() == QLatin1Char('\r');
+        qsizetype take = 0;
+        if (!overlong) {
+            take = qMin<qsizetype>(maxLineChars - line.size(), chars.size());
+            overlong = take < chars.size();
+            line.append(chars.left(take));
+            // Keep a surrogate pair together, also when it was split
+            // between two reads.
+            if (overlong && !line.isEmpty() && line.back().isHighSurrogate()) {
+                line.chop(1);
+                ++skippedChars;
+            }
         }
-        if (bytes.isEmpty())
+        skippedChars += chars.size() - take;
+    };
+
+    bool firstBlock = true;
+    while (true) {
+        if (!firstBlock && stopRequested())
+            return hasHit;
+        firstBlock = false;
+        const QByteArray block = device.read(blockSize);
+        if (block.isEmpty())
             break;
+        QByteArray bytes = carry + block;
+        carry.clear();
+        const qsizetype odd = bytes.size() % unitBytes;
+        if (odd) {
+            carry = bytes.right(odd);
+            bytes.chop(odd);
+        }
         const QString text = decoder.decode(bytes);
+        const QStringView view(text);
         qsizetype start = 0;
-        while (start < text.size()) {
-            const qsizetype newline = text.indexOf(QLatin1Char('\n'), start);
-            const qsizetype stop = newline < 0 ? text.size() : newline;
-            const qsizetype room = maxLineChars - line.size();
-            const qsizetype take = skippedChars ? 0 : qMin<qsizetype>(room, stop - start);
-            line.append(QStringView(text).mid(start, take));
-            skippedChars += (stop - start) - take;
-            if (newline < 0)
+        while (start < view.size()) {
+            const qsizetype newline = view.indexOf(QLatin1Char('\n'), start);
+            if (newline < 0) {
+                addToLine(view.mid(start));
                 break;
-            if (lineNumber % pollInterval == 0 && shouldStop && shouldStop())
+            }
+            if (lineNumber % pollInterval == 0 && stopRequested())
                 return hasHit;
+            addToLine(view.mid(start, newline - start));
             finishLine(true);
             if (stopped)
                 return hasHit;
             start = newline + 1;
         }
     }
-    // An odd byte at the end decodes as a replacement character.
-    if (!carry.isEmpty())
-        line.append(QChar::ReplacementCharacter);
-    if (!line.isEmpty() || skippedChars > 0) {
-        if (!(lineNumber % pollInterval == 0 && shouldStop && shouldStop()))
-            finishLine(false);
+    // A file that ends inside a code unit ends with an undecodable character.
+    if (!carry.isEmpty()) {
+        const QChar replacement(QChar::ReplacementCharacter);
+        addToLine(QStringView(&replacement, 1));
+    }
+    if (!line.isEmpty() || overlong) {
+        if (lineNumber % pollInterval == 0 && stopRequested())
+            return hasHit;
+        finishLine(false);
     }
     return hasHit;
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <QString>
+#include <QStringConverter>
 #include <QtCore5Compat/QRegExp>
 
 #include <functional>
@@ -14,10 +15,10 @@ namespace Orba {
 // It knows nothing of jobs or signals, so it can be driven by any reader.
 //
 // Lines are physical lines, whatever their length; "\n" ends a line and a
-// "\r" before it belongs to the terminator. Files that start with a UTF-16
-// byte-order mark are read as UTF-16, all others as UTF-8; a byte-order mark
-// is not part of the text and is not counted. Offsets count the characters
-// (UTF-16 code units) of every line as decoded.
+// "\r" before it belongs to the terminator. Files that start with a UTF-16 or
+// UTF-32 byte-order mark are read in that encoding, all others as UTF-8; a
+// byte-order mark is not part of the text and is not counted. Offsets count
+// the characters (UTF-16 code units) of every line as decoded.
 class FifLineScanner
 {
 public:
@@ -31,14 +32,15 @@ public:
 
     // Called for every matching line.
     using MatchSink = std::function<void(const Match&)>;
-    // Polled every `pollInterval` lines; true ends the scan.
+    // Polled every `pollInterval` lines and before every further block read;
+    // true ends the scan.
     using StopPoll = std::function<bool()>;
 
-    explicit FifLineScanner(const QRegExp& expression);
-
-    // Lines longer than this many bytes are matched on their first
-    // `maxLineBytes` only; the numbers and offsets of later lines stay true.
-    static constexpr qint64 maxLineBytes = 16 * 1024 * 1024;
+    // Lines up to this many bytes are matched whole; of a longer line only
+    // about this many bytes are kept for matching (memory stays bounded), and
+    // the numbers and offsets of later lines stay true.
+    static constexpr qint64 defaultMaxLineBytes = 16 * 1024 * 1024;
+    static constexpr qint64 defaultBlockSize = 256 * 1024;
     static constexpr int pollInterval = 100;
     // Qt's regular-expression engine takes time quadratic in the line's
     // length for many patterns (a*b, .*x, nested repetition) when a line
@@ -48,14 +50,19 @@ public:
     // is the same leftmost match; see indexIn().
     static constexpr int sliceThreshold = 1024;
 
+    explicit FifLineScanner(const QRegExp& expression,
+                            qint64 maxLineBytes = defaultMaxLineBytes,
+                            qint64 blockSize = defaultBlockSize);
+
     // Returns whether any line matched.
     bool scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
 
 private:
     bool scanUtf8(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
-    bool scanUtf16(QIODevice& device, bool bigEndian, const MatchSink& sink,
-                   const StopPoll& shouldStop);
-    // Matches one line and advances the counters past it.
+    bool scanDecoded(QIODevice& device, QStringConverter::Encoding encoding, int unitBytes,
+                     const MatchSink& sink, const StopPoll& shouldStop);
+    // Matches one line and advances the counters past it. `extraChars` are
+    // characters of the line that were not kept in `text`.
     bool matchLine(const QString& text, int terminatorLength, qint64 extraChars,
                    const MatchSink& sink, const StopPoll& shouldStop);
     // The first match in `text`, as rx.indexIn() with QRegExp::CaretAtZero
@@ -63,6 +70,8 @@ private:
     int indexIn(const QString& text, const StopPoll& shouldStop);
 
     QRegExp rx;
+    qint64 maxLineBytes;
+    qint64 blockSize;
     // rx anchored at the offset searched from, when that gives the same
     // matches: a regular expression without any '^', which could otherwise
     // mean the start of the line. Invalid when lines are matched whole.

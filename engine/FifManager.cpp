@@ -23,6 +23,7 @@ FifManager* FifManager::getInstance(MainWindow* mainWindow)
 
 FifManager::FifManager(MainWindow* mainWindow)
     : QObject(mainWindow)
+    , actionMapper(this)
 {
     qRegisterMetaType<FifHit>("Gui::Orba::FifHit");
     qRegisterMetaType<FifHitList>("Gui::Orba::FifHitList");
@@ -86,6 +87,11 @@ void FifManager::setFilters(const QStringList& list)
 MainWindow* FifManager::getMainWindow() const
 {
     return qobject_cast<MainWindow*>(parent());
+}
+
+FifActionMapper* FifManager::getActionMapper() const
+{
+    return &actionMapper;
 }
 
 } // namespace Orba

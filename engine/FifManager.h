@@ -1,6 +1,7 @@
 #pragma once
 
 #include "fif_export.h"
+#include "FifActionMapper.h"
 
 #include <QList>
 #include <QMap>
@@ -44,11 +45,16 @@ public:
 
     MainWindow* getMainWindow() const;
 
+    // The window's shared-action mapper; never null.
+    FifActionMapper* getActionMapper() const;
+
 private:
     static QMap<MainWindow*, FifManager*>* s_wndToMrgMap;
 
     // Guarded: a job put in by replaceJob() may be deleted by its owner.
     mutable QList<QPointer<FifJob>> jobs;
+    // A member rather than a child: it lives exactly as long as the manager.
+    mutable FifActionMapper actionMapper;
     QStringList filters;
 };
 

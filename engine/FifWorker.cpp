@@ -88,20 +88,19 @@ bool FifWorker::isTextFile(const QFileInfo& info)
     QFile file(info.filePath());
     if (!file.open(QIODevice::ReadOnly))
         return false;
+    // Read in pieces rather than by readLine(), so that one huge first line
+    // does not have to fit in memory. Only "\n" ends a line, as for
+    // readLine(); line breaks are white space and never decide the answer.
     QTextStream stream(&file);
-    // Read in pieces rather than whole lines: a huge line (a sparse file of
-    // zero bytes, say) is judged by its first characters instead of being
-    // read and held whole. The characters examined are the same: those of
-    // the first 20 lines.
     int lines = 0;
-    while (lines < 20 && !stream.atEnd()) {
+    while (!stream.atEnd()) {
         const QString piece = stream.read(4096);
         if (piece.isEmpty())
             break;
         for (const QChar c : piece) {
             if (c == QLatin1Char('\n')) {
                 if (++lines == 20)
-                    break;
+                    return true;
             } else if (c.category() == QChar::Other_Control && !c.isSpace()) {
                 return false;
             }

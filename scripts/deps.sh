@@ -24,3 +24,7 @@ FIF_BUILD_PACKAGES=(cmake ninja-build g++ pkg-config libgl-dev
 # What the sanitizer builds and the fuzz targets need besides: clang with its
 # runtime libraries (libFuzzer, ASan, UBSan, TSan).
 FIF_CHECK_PACKAGES=(clang libclang-rt-14-dev)
+
+# What docs/screenshot.sh needs besides: a virtual X display, a way to type
+# into the application, and a camera.
+FIF_SCREENSHOT_PACKAGES=(xvfb xauth xdotool imagemagick)

@@ -32,6 +32,13 @@ void putOnTop(QComboBox& box, const QString& text)
 
 void selectOrAdd(QComboBox& box, const QString& text)
 {
+    // An empty text is shown as such; as an entry it would be stored in the
+    // history with the next search.
+    if (text.isEmpty() && box.isEditable()) {
+        box.setCurrentIndex(-1);
+        box.setEditText(QString());
+        return;
+    }
     int found = box.findText(text, Qt::MatchExactly | Qt::MatchCaseSensitive);
     if (found < 0) {
         box.addItem(text);

@@ -13,9 +13,6 @@ private slots:
     void defaults();
     void filterArgument_data();
     void filterArgument();
-    void copies();
-    void regExp_data();
-    void regExp();
     void matching_data();
     void matching();
     void validity_data();
@@ -55,77 +52,6 @@ void tst_FifInput::filterArgument()
     QCOMPARE(FifInput(argument).filter, filter);
 }
 
-void tst_FifInput::copies()
-{
-    FifInput a("*.txt");
-    a.what = "x";
-    a.where = "/tmp;/usr";
-    a.matchCase = Qt::CaseSensitive;
-    a.matchType = QRegExp::Wildcard;
-    a.includeSubFolders = false;
-    a.matchWord = true;
-    FifInput b(a);
-    FifInput c;
-    c = a;
-    for (const FifInput* copy : {&b, &c}) {
-        QCOMPARE(copy->what, a.what);
-        QCOMPARE(copy->where, a.where);
-        QCOMPARE(copy->filter, a.filter);
-        QCOMPARE(copy->matchCase, a.matchCase);
-        QCOMPARE(copy->matchType, a.matchType);
-        QCOMPARE(copy->includeSubFolders, a.includeSubFolders);
-        QCOMPARE(copy->matchWord, a.matchWord);
-    }
-    // A variant round trip keeps the request too.
-    const FifInput d = QVariant::fromValue(a).value<FifInput>();
-    QCOMPARE(d.what, a.what);
-    QCOMPARE(d.matchType, a.matchType);
-}
-
-void tst_FifInput::regExp_data()
-{
-    QTest::addColumn<QString>("what");
-    QTest::addColumn<int>("matchType");
-    QTest::addColumn<bool>("matchWord");
-    QTest::addColumn<QString>("pattern");
-    QTest::addColumn<int>("syntax");
-
-    const int fixed = QRegExp::FixedString;
-    const int wild = QRegExp::Wildcard;
-    const int rx2 = QRegExp::RegExp2;
-    QTest::newRow("literal") << "a.b" << fixed << false << "a.b" << fixed;
-    QTest::newRow("literal word") << "a.b" << fixed << true << "\\b(a\\.b)\\b" << rx2;
-    QTest::newRow("wildcard") << "a?c*" << wild << false << "a.c.*" << rx2;
-    QTest::newRow("wildcard word") << "a?c*" << wild << true << "\\b(a.c.*)\\b" << rx2;
-    QTest::newRow("wildcard brackets") << "[ab]" << wild << false << "\\[ab\\]" << rx2;
-    QTest::newRow("wildcard dot") << "a.b" << wild << false << "a\\.b" << rx2;
-    QTest::newRow("regexp") << "foo|bar" << rx2 << false << "foo|bar" << rx2;
-    QTest::newRow("regexp word") << "foo|bar" << rx2 << true << "\\b(foo|bar)\\b" << rx2;
-    QTest::newRow("other syntax") << "a+" << int(QRegExp::RegExp) << true << "a+"
-                                  << int(QRegExp::RegExp);
-}
-
-void tst_FifInput::regExp()
-{
-    QFETCH(QString, what);
-    QFETCH(int, matchType);
-    QFETCH(bool, matchWord);
-    QFETCH(QString, pattern);
-    QFETCH(int, syntax);
-
-    for (int matchCase : {int(Qt::CaseInsensitive), int(Qt::CaseSensitive)}) {
-        FifInput input;
-        input.what = what;
-        input.matchType = matchType;
-        input.matchWord = matchWord;
-        input.matchCase = matchCase;
-        const QRegExp rx = input.getRegExp();
-        QCOMPARE(rx.pattern(), pattern);
-        QCOMPARE(int(rx.patternSyntax()), syntax);
-        QCOMPARE(int(rx.caseSensitivity()), matchCase);
-    }
-}
-
 void tst_FifInput::matching_data()
 {
     QTest::addColumn<QString>("what");
@@ -153,6 +79,8 @@ void tst_FifInput::matching_data()
     QTest::newRow("regexp greedy class") << "[0-9]+" << rx2 << false << ci << "ab12" << 2;
     QTest::newRow("blanks literal") << "  " << fixed << false << ci << "a  b" << 1;
     QTest::newRow("empty-match wildcard") << "*" << wild << false << ci << "" << 0;
+    // Word matching applies to the three syntaxes of the dialog only.
+    QTest::newRow("other syntax, no word") << "a+" << int(QRegExp::RegExp) << true << ci << "baa" << 1;
 }
 
 void tst_FifInput::matching()

@@ -34,20 +34,6 @@ private:
 private slots:
     void initTestCase() { QVERIFY(dir.isValid()); }
 
-    void names()
-    {
-        const FifSettings keys;
-        QCOMPARE(keys.findInFilesGroup, QString("Find-In-Files"));
-        QCOMPARE(keys.findBarGroup, QString("FindBar"));
-        QCOMPARE(keys.findWhatKey, QString("Find what"));
-        QCOMPARE(keys.matchCaseKey, QString("MatchCase"));
-        QCOMPARE(keys.matchWordKey, QString("MatchWord"));
-        QCOMPARE(keys.matchTypeKey, QString("MatchType"));
-        QCOMPARE(keys.whereKey, QString("WhereKey"));
-        QCOMPARE(keys.filterKey, QString("CurrentFilterKey"));
-        QCOMPARE(keys.includeSubFolderKey, QString("IncludeSubFolderKey"));
-    }
-
     void keyPaths()
     {
         const FifSettings keys;
@@ -60,30 +46,15 @@ private slots:
         QCOMPARE(keys.getIncludeSubFolderKeyPath(), QString("Find-In-Files/IncludeSubFolderKey"));
     }
 
-    void pathsFollowTheMembers()
+    void emptyGroupGivesNoPath()
     {
         FifSettings keys;
-        keys.findBarGroup = "Bar";
-        keys.findWhatKey = "What ";
-        FifSettings copy(keys);
-        QCOMPARE(copy.getFindWhatKeyPath(), QString("Bar/What "));
-        QCOMPARE(copy.getMatchCaseKeyPath(), QString("Bar/MatchCase"));
-
-        // An empty group gives no path at all for its keys.
-        copy.findBarGroup.clear();
-        QVERIFY(copy.getFindWhatKeyPath().isEmpty());
-        QVERIFY(copy.getMatchCaseKeyPath().isEmpty());
-        QVERIFY(copy.getMatchWordKeyPath().isEmpty());
-        QVERIFY(copy.getMatchTypeKeyPath().isEmpty());
-        QCOMPARE(copy.getWhereKeyPath(), QString("Find-In-Files/WhereKey"));
-
-        FifSettings assigned;
-        assigned = copy;
-        assigned.findInFilesGroup.clear();
-        QVERIFY(assigned.getWhereKeyPath().isEmpty());
-        QVERIFY(assigned.getFilterKeyPath().isEmpty());
-        QVERIFY(assigned.getIncludeSubFolderKeyPath().isEmpty());
-        QCOMPARE(copy.getWhereKeyPath(), QString("Find-In-Files/WhereKey"));
+        keys.findBarGroup.clear();
+        QVERIFY(keys.getFindWhatKeyPath().isEmpty());
+        QVERIFY(keys.getMatchTypeKeyPath().isEmpty());
+        QCOMPARE(keys.getWhereKeyPath(), QString("Find-In-Files/WhereKey"));
+        keys.findInFilesGroup.clear();
+        QVERIFY(keys.getWhereKeyPath().isEmpty());
     }
 
     void readers_data()
@@ -132,12 +103,18 @@ private slots:
         QCOMPARE(keys.getFilterString(store.get()), filter);
     }
 
-    void readersWithoutStore()
+    void withoutStore()
     {
         const FifSettings keys;
         QVERIFY(keys.getWhatString(nullptr).isEmpty());
         QVERIFY(keys.getWhereString(nullptr).isEmpty());
         QVERIFY(keys.getFilterString(nullptr).isEmpty());
+        FifInput request;
+        request.what = "kept";
+        request.matchType = QRegExp::Wildcard;
+        request.setContents(nullptr);
+        QCOMPARE(request.what, QString("kept"));
+        QCOMPARE(request.matchType, int(QRegExp::Wildcard));
     }
 
     void setContents_data()
@@ -185,9 +162,6 @@ private slots:
             << false << wildcard << "" << true << "*" << insensitive << fixed << false << true;
         QTest::newRow("MatchType 7 is ignored")
             << Stored{{"FindBar/MatchType", 7}}
-            << false << wildcard << "" << true << "*" << insensitive << wildcard << false << true;
-        QTest::newRow("MatchType 3 is not the stored encoding")
-            << Stored{{"FindBar/MatchType", 3}}
             << false << wildcard << "" << true << "*" << insensitive << wildcard << false << true;
         QTest::newRow("MatchType -1 is ignored")
             << Stored{{"FindBar/MatchType", -1}}
@@ -255,28 +229,6 @@ private slots:
         QCOMPARE(request.what, QString("x"));
     }
 
-    void setContentsWithoutStore()
-    {
-        FifInput request;
-        request.what = "kept";
-        request.matchType = QRegExp::Wildcard;
-        request.matchCase = Qt::CaseSensitive;
-        request.setContents(nullptr);
-        QCOMPARE(request.what, QString("kept"));
-        QCOMPARE(request.matchType, int(QRegExp::Wildcard));
-        QCOMPARE(request.matchCase, int(Qt::CaseSensitive));
-    }
-
-    void memoryStoreReadsTheSame()
-    {
-        Settings memory;
-        memory.setValue("FindBar/Find what", QStringList{"foo", "bar"});
-        memory.setValue("FindBar/MatchType", 0);
-        FifInput request;
-        request.setContents(&memory);
-        QCOMPARE(request.what, QString("foo"));
-        QCOMPARE(request.matchType, int(QRegExp::RegExp2));
-    }
 };
 
 QTEST_GUILESS_MAIN(tst_FifSettings)

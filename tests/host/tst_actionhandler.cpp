@@ -43,13 +43,11 @@ class tst_ActionHandler : public QObject
 private slots:
     void baseDoesNothing()
     {
-        QObject parent;
-        auto* handler = new ActionHandler(&parent);
-        QCOMPARE(handler->parent(), &parent);
-        QVERIFY(!handler->doAction());
+        ActionHandler handler;
+        QVERIFY(!handler.doAction());
         QAction action;
-        handler->addAction(&action);
-        handler->updateAction(&action);
+        handler.addAction(&action);
+        handler.updateAction(&action);
         action.trigger();
         QVERIFY(action.isEnabled());
     }
@@ -68,6 +66,8 @@ private slots:
         first.trigger();
         second.trigger();
         QCOMPARE(handler.triggeredBy, (QList<QAction*>{&first, &second}));
+        handler.updateActions();
+        QCOMPARE(handler.updated, (QList<QAction*>{&first, &second}));
     }
 
     void removedActionIsLetGo()
@@ -100,17 +100,6 @@ private slots:
         QCOMPARE(handler.getActions(), QList<QAction*>{&kept});
         handler.updateActions();
         QCOMPARE(handler.updated, QList<QAction*>{&kept});
-    }
-
-    void updateActionsVisitsEach()
-    {
-        RecordingHandler handler;
-        QAction a, b, c;
-        handler.addAction(&a);
-        handler.addAction(&b);
-        handler.addAction(&c);
-        handler.updateActions();
-        QCOMPARE(handler.updated, (QList<QAction*>{&a, &b, &c}));
     }
 
     void actionDeletedWhileUpdating()

@@ -18,15 +18,10 @@ private slots:
                     .removeRecursively());
     }
 
-    void instanceIsTheApplication()
-    {
-        QVERIFY(ApplicationBase::getInstance());
-        QCOMPARE(ApplicationBase::getInstance(), qApp);
-    }
-
     void defaultStoreLivesInTheConfigFolder()
     {
         ApplicationBase* app = ApplicationBase::getInstance();
+        QCOMPARE(ApplicationBase::getInstance(), qApp);
         Settings* settings = app->getSettings();
         QVERIFY(settings);
         QCOMPARE(app->getSettings(), settings);

@@ -14,10 +14,7 @@ private slots:
     {
         MainWindow window;
         auto* dock = new DockWidget("Find in Files 1", &window, "FifResultsDockWidget");
-        QCOMPARE(dock->parentWidget(), &window);
         QCOMPARE(dock->objectName(), QString("FifResultsDockWidget"));
-        QCOMPARE(dock->windowTitle(), QString("Find in Files 1"));
-        QCOMPARE(dock->windowFlags() & Qt::WindowType_Mask, Qt::Widget);
         window.addDockWidget(Qt::BottomDockWidgetArea, dock);
         QCOMPARE(window.dockWidgetArea(dock), Qt::BottomDockWidgetArea);
         window.show();

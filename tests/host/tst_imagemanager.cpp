@@ -61,12 +61,6 @@ private slots:
         QVERIFY(ImageManager::getInstance()->getIcon(QString()).isNull());
         QVERIFY(ImageManager::getInstance()->getIcon("../help/index").isNull());
     }
-
-    void oneInstance()
-    {
-        QVERIFY(ImageManager::getInstance());
-        QCOMPARE(ImageManager::getInstance(), ImageManager::getInstance());
-    }
 };
 
 QTEST_MAIN(tst_ImageManager)

@@ -29,16 +29,6 @@ private slots:
         QTRY_VERIFY(!MainWindow::getInstance());
     }
 
-    void isAQMainWindowWithMetaObject()
-    {
-        MainWindow window;
-        QCOMPARE(window.metaObject()->className(), "Gui::Orba::MainWindow");
-        QMainWindow* base = &window;
-        QCOMPARE(qobject_cast<MainWindow*>(base), &window);
-        QMainWindow plain;
-        QVERIFY(!qobject_cast<MainWindow*>(&plain));
-    }
-
     void widgetInsideAWindow()
     {
         MainWindow first;
@@ -59,16 +49,11 @@ private slots:
         QCOMPARE(MainWindow::getInstance(inDock), &first);
         QCOMPARE(MainWindow::getInstance(dialog), &first);
         QCOMPARE(MainWindow::getInstance(&second), &second);
-    }
 
-    void widgetOutsideEveryWindow()
-    {
-        MainWindow window;
         QWidget loose;
         QLineEdit child(&loose);
         QMainWindow plain;
         QCOMPARE(MainWindow::getInstance(&child), nullptr);
-        QCOMPARE(MainWindow::getInstance(&loose), nullptr);
         QCOMPARE(MainWindow::getInstance(&plain), nullptr);
     }
 

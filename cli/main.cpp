@@ -1,0 +1,135 @@
+// fif: searches files as the Find in Files dialog does and prints the hits.
+//
+// It runs the very path of the GUI: a job with its worker thread, whose hits
+// reach the job's model through queued signals on this event loop; the hits
+// are printed from the model in row order as they arrive.
+
+#include "FifCommandLine.h"
+#include "FifHitPrinter.h"
+#include "FifHitsModel.h"
+#include "FifInput.h"
+#include "FifJob.h"
+#include "FifManager.h"
+
+#include <QCoreApplication>
+#include <QObject>
+
+#include <cerrno>
+#include <csignal>
+#include <cstdio>
+#include <cstring>
+
+#include <fcntl.h>
+#include <unistd.h>
+
+using namespace Gui::Orba;
+
+namespace {
+
+void printError(const QString& text)
+{
+    std::fputs(text.toLocal8Bit().constData(), stderr);
+    std::fputc('\n', stderr);
+    std::fflush(stderr);
+}
+
+// The final counts, built as the results view builds its status text.
+QString statusText(const FifJob* job)
+{
+    const char* view = "Gui::Orba::FifHitsView";
+    return QCoreApplication::translate(view, "Found %n line(s)", "", job->getLineHitCount())
+           + QCoreApplication::translate(view, " in %n file(s)", "", job->getFileHitCount())
+           + QCoreApplication::translate(view, " out of %n file(s)", "",
+                                         job->getReadFileCount());
+}
+
+// The find dialog's checks of the expression, with its titles and messages.
+bool checkExpression(const FifInput& request)
+{
+    const char* dialog = "Gui::Orba::FifDialog";
+    if (request.what.isEmpty()) {
+        printError(QCoreApplication::translate(dialog, "Empty Expression") + QStringLiteral(": ")
+                   + QCoreApplication::translate(
+                       dialog, "Please enter the search expression in the \"Find what:\" field."));
+        return false;
+    }
+    const QRegExp expression = request.getRegExp();
+    if (!expression.isValid()) {
+        const QString message = QCoreApplication::translate(dialog, "%1: \"%2\"")
+                                    .arg(expression.errorString(), request.what);
+        printError(QCoreApplication::translate(dialog, "Bad Expression") + QStringLiteral(": ")
+                   + message);
+        return false;
+    }
+    return true;
+}
+
+} // namespace
+
+int main(int argc, char* argv[])
+{
+    // A standard descriptor that was closed before the start would be
+    // handed to the next file or event descriptor Qt opens, and hits would
+    // be written into it; /dev/null takes its place first.
+    bool outputClosed = false;
+    for (int fd = STDIN_FILENO; fd <= STDERR_FILENO; ++fd) {
+        if (fcntl(fd, F_GETFD) == -1 && errno == EBADF) {
+            outputClosed = outputClosed || fd == STDOUT_FILENO;
+            if (open("/dev/null", fd == STDIN_FILENO ? O_RDONLY : O_WRONLY) != fd)
+                return 2;
+        }
+    }
+    if (outputClosed) {
+        std::fputs("fif: standard output is closed\n", stderr);
+        return 2;
+    }
+
+    // A reader that goes away (fif ... | head) shows as EPIPE on the next
+    // write, which stops the search; the default would kill the process.
+    std::signal(SIGPIPE, SIG_IGN);
+
+    QCoreApplication app(argc, argv);
+    QCoreApplication::setApplicationName(QStringLiteral("fif"));
+    QCoreApplication::setApplicationVersion(QStringLiteral(FIF_VERSION));
+
+    FifCommandLine commandLine;
+    switch (commandLine.parse(QCoreApplication::arguments())) {
+    case FifCommandLine::Help:
+        std::fputs(commandLine.getHelpText().toLocal8Bit().constData(), stdout);
+        return 0;
+    case FifCommandLine::Version:
+        std::fputs(FifCommandLine::getVersionText().toLocal8Bit().constData(), stdout);
+        return 0;
+    case FifCommandLine::Error:
+        printError(QStringLiteral("fif: ") + commandLine.getErrorText());
+        printError(QCoreApplication::translate("FifCommandLine",
+                                               "Try 'fif --help' for more information."));
+        return 2;
+    case FifCommandLine::Search:
+        break;
+    }
+
+    const FifInput request = commandLine.getRequest();
+    if (!checkExpression(request))
+        return 2;
+
+    FifManager manager;
+    FifJob* job = manager.getJob(0);
+    FifHitPrinter printer(job->getHitsModel(), stdout);
+    QObject::connect(&printer, &FifHitPrinter::outputFailed, job, &FifJob::stop);
+    QObject::connect(job, &QThread::finished, &app, [&] {
+        // Hits sent before the end arrive before finished(), so every row
+        // has been printed by now.
+        if (printer.getWriteError() != 0) {
+            printError(QStringLiteral("fif: ")
+                       + QCoreApplication::translate("FifCommandLine", "Cannot write output: %1")
+                             .arg(QString::fromLocal8Bit(std::strerror(printer.getWriteError()))));
+            app.exit(2);
+            return;
+        }
+        printError(statusText(job));
+        app.exit(job->getLineHitCount() > 0 ? 0 : 1);
+    });
+    job->start(request);
+    return app.exec();
+}
