@@ -14,7 +14,9 @@ set(FIF_PRIVATE_HEADERS
     ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.h
     ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h
     ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.h
-    ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.h)
+    ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.h
+    ${PROJECT_SOURCE_DIR}/engine/FifLocker.h
+    ${PROJECT_SOURCE_DIR}/engine/FifHandOff.h)
 
 add_library(FindInFiles SHARED ${FIF_ENGINE_SOURCES} ${FIF_UI_SOURCES})
 add_library(FindInFiles::FindInFiles ALIAS FindInFiles)

@@ -1,6 +1,7 @@
 #include "FifHitsModel.h"
 
 #include "FifJob.h"
+#include "FifLocker.h"
 
 namespace Gui {
 namespace Orba {
@@ -10,13 +11,16 @@ FifHitsModel::FifHitsModel(QObject* parent)
 {
 }
 
-FifHitsModel::~FifHitsModel() = default;
+FifHitsModel::~FifHitsModel()
+{
+    FifLocker::forget(&lock);
+}
 
 int FifHitsModel::rowCount(const QModelIndex& parent) const
 {
     if (parent.isValid())
         return 0;
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return int(hits.size());
 }
 
@@ -33,7 +37,7 @@ QVariant FifHitsModel::data(const QModelIndex& index, int role) const
         return QVariant();
     FifHit hit;
     {
-        QReadLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Read);
         if (index.row() >= hits.size())
             return QVariant();
         hit = hits.at(index.row());
@@ -56,7 +60,7 @@ bool FifHitsModel::setData(const QModelIndex& index, const QVariant& value, int 
     if (!index.isValid() || role != Qt::EditRole)
         return false;
     {
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         if (index.row() >= hits.size())
             return false;
         hits[index.row()] = value.value<FifHit>();
@@ -84,7 +88,7 @@ bool FifHitsModel::insertRows(int row, int count, const QModelIndex& /*parent*/)
         return false;
     beginInsertRows(QModelIndex(), row, row + count - 1);
     {
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         hits.insert(row, count, FifHit());
         rowsKept.storeRelease(int(hits.size()));
     }
@@ -99,7 +103,7 @@ void FifHitsModel::appendValidHits(const FifHitList& batch, int validCount)
     const int row = rowCount();
     beginInsertRows(QModelIndex(), row, row + validCount - 1);
     {
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         for (const FifHit& hit : batch) {
             if (hit.isValid())
                 hits.append(hit);
@@ -124,7 +128,7 @@ bool FifHitsModel::removeRows(int row, int count, const QModelIndex& /*parent*/)
     const int last = qMin(row + count, size) - 1;
     beginRemoveRows(QModelIndex(), row, last);
     {
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         hits.remove(row, last - row + 1);
         rowsKept.storeRelease(int(hits.size()));
     }

@@ -1,6 +1,8 @@
 #include "FifJob.h"
 
+#include "FifHandOff.h"
 #include "FifHitsModel.h"
+#include "FifLocker.h"
 #include "FifManager.h"
 #include "FifWorker.h"
 
@@ -23,6 +25,7 @@ FifJob::~FifJob()
         setShouldStop(true);
         wait();
     }
+    FifLocker::forget(&lock);
 }
 
 bool FifJob::start(const FifInput& request)
@@ -37,7 +40,7 @@ bool FifJob::start(const FifInput& request)
         model->removeRows(0, rows, QModelIndex());
     {
         // The thread is not running, but the lock keeps the counters' rule simple.
-        QWriteLocker locker(&lock);
+        FifLocker locker(&lock, FifLocker::Write);
         readFileCount = 0;
         fileHitCount = 0;
     }
@@ -49,13 +52,13 @@ bool FifJob::start(const FifInput& request)
 
 bool FifJob::shouldStop() const
 {
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return stopFlag;
 }
 
 void FifJob::setShouldStop(bool value)
 {
-    QWriteLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Write);
     stopFlag = value;
 }
 
@@ -66,25 +69,25 @@ void FifJob::stop()
 
 int FifJob::getReadFileCount() const
 {
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return readFileCount;
 }
 
 int FifJob::getFileHitCount() const
 {
-    QReadLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Read);
     return fileHitCount;
 }
 
 void FifJob::incrementReadFileCount()
 {
-    QWriteLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Write);
     ++readFileCount;
 }
 
 void FifJob::incrementFileHitCount()
 {
-    QWriteLocker locker(&lock);
+    FifLocker locker(&lock, FifLocker::Write);
     ++fileHitCount;
 }
 
@@ -131,6 +134,7 @@ MainWindow* FifJob::getMainWindow() const
 // either way, without a lock and a variant per hit.
 void FifJob::appendHit(const FifHit& hit)
 {
+    FifHandOff::received(this);
     if (!hit.isValid())
         return;
     getHitsModel()->appendValidHits(FifHitList{hit}, 1);
@@ -138,6 +142,7 @@ void FifJob::appendHit(const FifHit& hit)
 
 void FifJob::appendHits(const FifHitList& hits)
 {
+    FifHandOff::received(this);
     int count = 0;
     for (const FifHit& hit : hits)
         count += hit.isValid() ? 1 : 0;

@@ -76,6 +76,33 @@ FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint6
     , maxLineBytes(qMax<qint64>(maxBytes, 1))
     , blockSize(qMax<qint64>(block, 1))
 {
+    const QRegExp::PatternSyntax syntax = rx.patternSyntax();
+    if ((syntax == QRegExp::RegExp || syntax == QRegExp::RegExp2) && rx.isValid()
+        && !rx.pattern().contains(QLatin1Char('^'))) {
+        anchored = QRegExp(QLatin1String("^(?:") + rx.pattern() + QLatin1Char(')'),
+                           rx.caseSensitivity(), syntax);
+        anchored.setMinimal(rx.isMinimal());
+        if (!anchored.isValid())
+            anchored = QRegExp();
+    }
+}
+
+int FifLineScanner::indexIn(const QString& text, const StopPoll& shouldStop)
+{
+    if (text.size() <= sliceThreshold || anchored.pattern().isEmpty())
+        return rx.indexIn(text, 0, QRegExp::CaretAtZero);
+    // With the caret at the offset, "^(?:P)" can only match at the offset,
+    // and does so exactly when P matches there: P holds no caret, and every
+    // other assertion sees the whole line as before.
+    for (int start = 0; start <= text.size(); ++start) {
+        if (shouldStop && shouldStop()) {
+            stopped = true;
+            return -1;
+        }
+        if (anchored.indexIn(text, start, QRegExp::CaretAtOffset) == start)
+            return start;
+    }
+    return -1;
 }
 
 bool FifLineScanner::scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop)
@@ -107,10 +134,10 @@ bool FifLineScanner::scan(QIODevice& device, const MatchSink& sink, const StopPo
 }
 
 bool FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars,
-                               const MatchSink& sink)
+                               const MatchSink& sink, const StopPoll& shouldStop)
 {
     bool matched = false;
-    const int position = rx.indexIn(text, 0, QRegExp::CaretAtZero);
+    const int position = indexIn(text, shouldStop);
     if (position >= 0) {
         matched = true;
         sink(Match{clampToInt(lineNumber), clampToInt(offset + position),
@@ -195,7 +222,7 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
             if (!tail.isEmpty())
                 skippedChars += utf8Length(decoder, tail.constData(), tail.size());
             if (matchLine(decodeUtf8(decoder, line.constData(), line.size()), terminator,
-                          skippedChars, sink))
+                          skippedChars, sink, shouldStop))
                 hasHit = true;
         }
         // Keep the buffers' memory for the next line.
@@ -310,6 +337,8 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
                 return hasHit;
             addToLine(data, newline - data);
             finishLine(true);
+            if (stopped)
+                return hasHit;
             data = newline + 1;
         }
         const char* lastNewline =
@@ -357,7 +386,7 @@ bool FifLineScanner::scanDecoded(QIODevice& device, QStringConverter::Encoding e
             else
                 line.chop(1);
         }
-        if (matchLine(line, terminator, skippedChars, sink))
+        if (matchLine(line, terminator, skippedChars, sink, shouldStop))
             hasHit = true;
         line.clear();
         overlong = false;
@@ -412,6 +441,8 @@ bool FifLineScanner::scanDecoded(QIODevice& device, QStringConverter::Encoding e
                 return hasHit;
             addToLine(view.mid(start, newline - start));
             finishLine(true);
+            if (stopped)
+                return hasHit;
             start = newline + 1;
         }
     }

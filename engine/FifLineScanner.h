@@ -44,6 +44,13 @@ public:
     static constexpr qint64 defaultMaxLineBytes = 16 * 1024 * 1024;
     static constexpr qint64 defaultBlockSize = 256 * 1024;
     static constexpr int pollInterval = 100;
+    // Qt's regular-expression engine takes time quadratic in the line's
+    // length for many patterns (a*b, .*x, nested repetition) when a line
+    // holds no match. Lines longer than this are therefore matched one
+    // start position at a time, with a stop poll before each, so that a
+    // stop request is noticed within one position's attempt. The result
+    // is the same leftmost match; see indexIn().
+    static constexpr int sliceThreshold = 1024;
 
     explicit FifLineScanner(const QRegExp& expression,
                             qint64 maxLineBytes = defaultMaxLineBytes,
@@ -65,7 +72,10 @@ private:
     // Matches one line and advances the counters past it. `extraChars` are
     // characters of the line that were not kept in `text`.
     bool matchLine(const QString& text, int terminatorLength, qint64 extraChars,
-                   const MatchSink& sink);
+                   const MatchSink& sink, const StopPoll& shouldStop);
+    // The first match in `text`, as rx.indexIn() with QRegExp::CaretAtZero
+    // finds it; sets `stopped` when a stop request ends the search first.
+    int indexIn(const QString& text, const StopPoll& shouldStop);
 
     QRegExp rx;
     FifPrefilter prefilter;
@@ -74,6 +84,11 @@ private:
     qint64 blockSize;
     // Two, so that a block passed over can be counted after the next read.
     QByteArray buffers[2];
+    // rx anchored at the offset searched from, when that gives the same
+    // matches: a regular expression without any '^', which could otherwise
+    // mean the start of the line. Invalid when lines are matched whole.
+    QRegExp anchored;
+    bool stopped = false;
     qint64 lineNumber = 1;
     qint64 offset = 0;
     qint64 rawOffset = 0;

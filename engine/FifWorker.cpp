@@ -1,6 +1,7 @@
 #include "FifWorker.h"
 
 #include "FifFileDevice.h"
+#include "FifHandOff.h"
 #include "FifJob.h"
 #include "FifLineScanner.h"
 #include "FifTextTest.h"
@@ -172,7 +173,10 @@ void FifWorker::searchFile(const QString& path)
     }
     if (job)
         job->incrementReadFileCount();
-    emit searching(path);
+    {
+        FifHandOff handOff(job);
+        emit searching(path);
+    }
 
     FifHitList batch;
     const bool hasHit = scanner->scan(
@@ -185,8 +189,10 @@ void FifWorker::searchFile(const QString& path)
 
     if (hasHit && job)
         job->incrementFileHitCount();
-    if (!batch.isEmpty())
+    if (!batch.isEmpty()) {
+        FifHandOff handOff(job);
         emit found(batch);
+    }
 }
 
 void FifWorker::sendHit(const FifHit& hit, FifHitList& batch)
@@ -198,15 +204,22 @@ void FifWorker::sendHit(const FifHit& hit, FifHitList& batch)
         // Rows can drop when the view is cleared during a search; what is
         // waiting in the batch goes first so the order stays.
         if (!batch.isEmpty()) {
-            emit found(batch);
+            {
+                FifHandOff handOff(job);
+                emit found(batch);
+            }
             batch.clear();
         }
+        FifHandOff handOff(job);
         emit found(hit);
         return;
     }
     const int limit = qBound(10, 2 * rows, 100);
     if (batch.size() > limit) {
-        emit found(batch);
+        {
+            FifHandOff handOff(job);
+            emit found(batch);
+        }
         batch.clear();
     }
     batch.append(hit);

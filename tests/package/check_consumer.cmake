@@ -17,8 +17,14 @@ endif()
 file(RENAME ${prefix} ${WORK_DIR}/moved)
 set(prefix ${WORK_DIR}/moved)
 
+set(sanitize_args)
+if(SANITIZE)
+  set(sanitize_args "-DCMAKE_CXX_FLAGS=-fsanitize=${SANITIZE}"
+                    "-DCMAKE_EXE_LINKER_FLAGS=-fsanitize=${SANITIZE}")
+endif()
 execute_process(COMMAND ${CMAKE_COMMAND} -S ${SOURCE_DIR}/tests/package/consumer
                         -B ${WORK_DIR}/build -G Ninja -DCMAKE_PREFIX_PATH=${prefix}
+                        ${sanitize_args}
                 RESULT_VARIABLE result)
 if(result)
   message(FATAL_ERROR "configuring the consumer failed")
