@@ -16,7 +16,10 @@ FifJob::FifJob(FifManager* manager)
     // QThread emits finished() just before it marks itself as not running.
     // Joining the thread here, ahead of every other receiver of finished(),
     // lets those receivers rely on isRunning() being false.
-    connect(this, &QThread::finished, this, [this] { wait(); });
+    connect(this, &QThread::finished, this, [this] {
+        wait();
+        FifHandOff::received(this);
+    });
 }
 
 FifJob::~FifJob()
@@ -25,6 +28,7 @@ FifJob::~FifJob()
         setShouldStop(true);
         wait();
     }
+    FifHandOff::received(this);
     FifLocker::forget(&lock);
 }
 
@@ -32,6 +36,8 @@ bool FifJob::start(const FifInput& request)
 {
     if (isRunning())
         return false;
+    // The last run's thread has ended: what it did comes before this run.
+    FifHandOff::received(this);
 
     input = request;
     FifHitsModel* model = getHitsModel();
@@ -153,8 +159,11 @@ void FifJob::appendHits(const FifHitList& hits)
 
 void FifJob::run()
 {
-    FifWorker worker(this);
-    worker.searchFolders();
+    {
+        FifWorker worker(this);
+        worker.searchFolders();
+    }
+    FifHandOff::sent(this);
 }
 
 } // namespace Orba
