@@ -18,6 +18,16 @@ set(FIF_PRIVATE_HEADERS
     ${PROJECT_SOURCE_DIR}/engine/FifLocker.h
     ${PROJECT_SOURCE_DIR}/engine/FifHandOff.h)
 
+# The internal classes with their sources: tests and fuzz targets that use
+# them directly compile them in, as the library keeps their symbols hidden.
+set(FIF_ENGINE_INTERNAL_SOURCES ${FIF_PRIVATE_HEADERS})
+foreach(_fif_header ${FIF_PRIVATE_HEADERS})
+  string(REGEX REPLACE "\\.h$" ".cpp" _fif_source ${_fif_header})
+  if(EXISTS ${_fif_source})
+    list(APPEND FIF_ENGINE_INTERNAL_SOURCES ${_fif_source})
+  endif()
+endforeach()
+
 add_library(FindInFiles SHARED ${FIF_ENGINE_SOURCES} ${FIF_UI_SOURCES})
 add_library(FindInFiles::FindInFiles ALIAS FindInFiles)
 set_target_properties(FindInFiles PROPERTIES

@@ -13,17 +13,5 @@ foreach(_fif_test tst_fif tst_fifgrep)
   endif()
 endforeach()
 if(TARGET tst_fifgrep)
-  target_sources(tst_fifgrep PRIVATE
-      ${PROJECT_SOURCE_DIR}/engine/FifWorker.cpp
-      ${PROJECT_SOURCE_DIR}/engine/FifWorker.h
-      ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.cpp
-      ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h
-      ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.cpp
-      ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.h
-      ${PROJECT_SOURCE_DIR}/engine/FifTextTest.cpp
-      ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h
-      ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.cpp
-      ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.h
-      ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.cpp
-      ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.h)
+  target_sources(tst_fifgrep PRIVATE ${FIF_ENGINE_INTERNAL_SOURCES})
 endif()
