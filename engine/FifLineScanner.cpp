@@ -279,6 +279,9 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
                     return false;
                 addToLine(begin, newline - begin);
                 finishLine(true);
+                // A stop that came while a long line was matched ends here.
+                if (stopped)
+                    return false;
                 begin = newline + 1;
             }
             return true;
@@ -299,6 +302,8 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
                 return false;
             addToLine(lineStart, newline - lineStart);
             finishLine(true);
+            if (stopped)
+                return false;
             begin = newline + 1;
         }
         uncountedFrom = begin;

@@ -1,7 +1,8 @@
 // The text test and the line scanner on arbitrary file contents. Both are
 // checked against a plain reading of the same bytes written here on its own:
 // split at "\n", a "\r" before it belongs to the terminator, UTF-8 unless a
-// UTF-16 byte-order mark says otherwise, a UTF-8 byte-order mark skipped.
+// UTF-16 or UTF-32 byte-order mark says otherwise, a UTF-8 byte-order mark
+// skipped.
 //
 // Input: byte 0 picks the expression, byte 1 when the scan is stopped; the
 // rest is the file.
@@ -64,6 +65,21 @@ QString fromUtf8(const QByteArray& bytes)
 
 QList<Line> referenceLines(const QByteArray& bytes)
 {
+    // A UTF-32 byte-order mark (checked first: "FF FE 00 00" also starts
+    // like UTF-16's); an unfinished last code unit reads as U+FFFD.
+    const bool utf32LE = bytes.startsWith(QByteArray("\xFF\xFE\x00\x00", 4));
+    if (utf32LE || bytes.startsWith(QByteArray("\x00\x00\xFE\xFF", 4))) {
+        QByteArray body = bytes.mid(4);
+        const bool unfinished = body.size() % 4 != 0;
+        body.chop(body.size() % 4);
+        QStringDecoder decoder(utf32LE ? QStringDecoder::Utf32LE : QStringDecoder::Utf32BE,
+                               QStringDecoder::Flag::Stateless
+                                   | QStringDecoder::Flag::ConvertInitialBom);
+        QString text = decoder.decode(body);
+        if (unfinished)
+            text.append(QChar::ReplacementCharacter);
+        return splitLines(text.split(QLatin1Char('\n')));
+    }
     if (bytes.startsWith("\xFF\xFE") || bytes.startsWith("\xFE\xFF")) {
         const bool bigEndian = bytes.at(0) == '\xFE';
         QString text;

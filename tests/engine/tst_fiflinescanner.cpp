@@ -328,6 +328,31 @@ private slots:
         QCOMPARE(polls, 3);
     }
 
+    // A stop that comes while a long line is matched, one start position at
+    // a time, ends the scan there: no later line is matched, with the
+    // prefilter (required text "b") or without it (an alternation).
+    void stopWhileMatchingLongLine_data()
+    {
+        QTest::addColumn<QString>("pattern");
+        QTest::addColumn<int>("syntax");
+        QTest::newRow("prefiltered") << "b" << int(QRegExp::RegExp2);
+        QTest::newRow("every line") << "b|c" << int(QRegExp::RegExp2);
+    }
+
+    void stopWhileMatchingLongLine()
+    {
+        QFETCH(QString, pattern);
+        QFETCH(int, syntax);
+        const QByteArray bytes = QByteArray(4000, 'a') + "b\nb\nb\n";
+        int polls = 0;
+        const QList<Result> results =
+            scan(bytes, QRegExp(pattern, Qt::CaseSensitive, QRegExp::PatternSyntax(syntax)),
+                 FifLineScanner::defaultMaxLineBytes, FifLineScanner::defaultBlockSize,
+                 [&] { return ++polls > 10; });
+        QVERIFY(polls > 10);
+        QVERIFY2(results.isEmpty(), results.isEmpty() ? "" : toString(results.first()));
+    }
+
     // Lines that cannot match are passed over undecoded: every hit, line
     // number, offset and text stays what matching every line gives, also
     // with over-long lines, lines split between reads, CRLF, byte-order
