@@ -1,3 +1,4 @@
+#include "DockTest.h"
 #include "FileViewer.h"
 #include "FindInFilesWindow.h"
 
@@ -31,11 +32,6 @@
 using namespace Gui::Orba;
 
 namespace {
-
-FifHitsView* viewOf(QDockWidget* dock)
-{
-    return qobject_cast<FifHitsView*>(dock->widget());
-}
 
 // Answers the find dialog once it is up: `answer` fills it and presses a
 // button. Returns false if no dialog came.

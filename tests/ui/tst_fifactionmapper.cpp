@@ -1,3 +1,4 @@
+#include "DockTest.h"
 #include "FifActionMapper.h"
 #include "FifActions.h"
 #include "FifHitsView.h"
@@ -17,17 +18,6 @@
 using namespace Gui::Orba;
 
 namespace {
-
-FifHitsView* viewOf(QDockWidget* dock)
-{
-    return qobject_cast<FifHitsView*>(dock->widget());
-}
-
-// Qt keeps a dock behind another tab "visible", moved out of sight.
-bool inFront(QDockWidget* dock)
-{
-    return dock->isVisible() && !dock->visibleRegion().isEmpty();
-}
 
 // Makes the next step of the dock's view start from the first row: a list
 // that gets the focus makes its first row current.

@@ -1,3 +1,4 @@
+#include "DockTest.h"
 #include "FifHitsView.h"
 #include "FifJob.h"
 #include "FifManager.h"
@@ -13,17 +14,6 @@
 using namespace Gui::Orba;
 
 namespace {
-
-FifHitsView* viewOf(QDockWidget* dock)
-{
-    return qobject_cast<FifHitsView*>(dock->widget());
-}
-
-// Qt keeps a dock behind another tab "visible", moved out of sight.
-bool inFront(QDockWidget* dock)
-{
-    return dock->isVisible() && !dock->visibleRegion().isEmpty();
-}
 
 bool runJob(FifJob* job, const FifInput& request)
 {
