@@ -1,4 +1,5 @@
 #include "DockTest.h"
+#include "FindDialogAnswer.h"
 #include "FileViewer.h"
 #include "FindInFilesWindow.h"
 
@@ -37,22 +38,7 @@ namespace {
 // button. Returns false if no dialog came.
 bool answerDialog(QAction* command, const std::function<void(FifDialog*)>& answer)
 {
-    bool answered = false;
-    QTimer poll;
-    poll.setInterval(10);
-    QObject::connect(&poll, &QTimer::timeout, [&] {
-        auto* dialog = qobject_cast<FifDialog*>(QApplication::activeModalWidget());
-        if (!dialog)
-            return;
-        poll.stop();
-        answered = true;
-        answer(dialog);
-        if (dialog->isVisible()) // the answer did not close it
-            dialog->reject();
-    });
-    poll.start();
-    command->trigger();
-    return answered;
+    return answerFindDialog([command] { command->trigger(); }, answer);
 }
 
 void search(FifDialog* dialog, const QString& what, const QString& where)

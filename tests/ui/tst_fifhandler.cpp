@@ -4,6 +4,7 @@
 #include "FifManager.h"
 #include "FifResultsDockWidget.h"
 #include "FifSettings.h"
+#include "FindDialogAnswer.h"
 #include "HostTestMain.h"
 #include "MainWindow.h"
 
@@ -48,13 +49,7 @@ struct DialogSeen
 DialogSeen runWithDialog(const std::function<void()>& action)
 {
     DialogSeen seen;
-    QTimer poll;
-    poll.setInterval(10);
-    QObject::connect(&poll, &QTimer::timeout, [&] {
-        auto* dialog = qobject_cast<FifDialog*>(QApplication::activeModalWidget());
-        if (!dialog)
-            return;
-        poll.stop();
+    answerFindDialog(action, [&](FifDialog* dialog) {
         seen.dialog = dialog;
         seen.parent = dialog->parentWidget();
         seen.job = dialog->getJob();
@@ -68,10 +63,7 @@ DialogSeen runWithDialog(const std::function<void()>& action)
             seen.filter = filter->currentText();
             seen.filterEntries = entries(filter);
         }
-        dialog->reject();
     });
-    poll.start();
-    action();
     return seen;
 }
 
