@@ -104,7 +104,8 @@ inline bool run(FifJob* job, const FifInput& input, int timeoutMs = 20000)
 // Calls `answer` once with the next modal widget of type T, from inside that
 // widget's event loop. The flag reads true once it was answered.
 template <class T = QWidget>
-std::shared_ptr<bool> answer(std::function<void(T*)> answer, int timeoutMs = 10000)
+std::shared_ptr<bool> answer(typename std::common_type<std::function<void(T*)>>::type answer,
+                             int timeoutMs = 10000)
 {
     auto answered = std::make_shared<bool>(false);
     auto* timer = new QTimer;
