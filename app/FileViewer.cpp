@@ -1,5 +1,6 @@
 #include "FileViewer.h"
 
+#include "FifFileDecoder.h"
 #include "FifHit.h"
 #include "FifInput.h"
 #include "FifJob.h"
@@ -8,24 +9,10 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QFontDatabase>
-#include <QStringDecoder>
 #include <QTextBlock>
 #include <QtCore5Compat/QRegExp>
 
 namespace {
-
-// Decodes a file as the search reads it: UTF-16 when it starts with a UTF-16
-// byte-order mark, UTF-8 otherwise; a byte-order mark is not part of the text.
-QString decode(const QByteArray& bytes)
-{
-    if (bytes.startsWith("\xFF\xFE"))
-        return QStringDecoder(QStringDecoder::Utf16LE).decode(bytes.mid(2));
-    if (bytes.startsWith("\xFE\xFF"))
-        return QStringDecoder(QStringDecoder::Utf16BE).decode(bytes.mid(2));
-    if (bytes.startsWith("\xEF\xBB\xBF"))
-        return QString::fromUtf8(bytes.mid(3));
-    return QString::fromUtf8(bytes);
-}
 
 // The search counts one character per line break and ends lines at "\n"
 // only. The document would also break lines at a lone "\r" and at a few
@@ -111,7 +98,8 @@ bool FileViewer::loadFile(const QString& path, QString* error)
         return false;
     }
 
-    setPlainText(toDocumentText(decode(bytes)));
+    // Decoded as the search read it, so that offsets agree.
+    setPlainText(toDocumentText(Gui::Orba::FifFileDecoder::decodeFile(bytes)));
     filePath = path;
     fileModified = info.lastModified();
     fileSize = info.size();

@@ -33,36 +33,6 @@ void printError(const QString& text)
     std::fflush(stderr);
 }
 
-// The final counts, built as the results view builds its status text.
-QString statusText(const FifJob* job)
-{
-    const char* view = "Gui::Orba::FifHitsView";
-    return QCoreApplication::translate(view, "Found %n line(s)", "", job->getLineHitCount())
-           + QCoreApplication::translate(view, " in %n file(s)", "", job->getFileHitCount())
-           + QCoreApplication::translate(view, " out of %n file(s)", "",
-                                         job->getReadFileCount());
-}
-
-// The find dialog's checks of the expression, with its titles and messages.
-bool checkExpression(const FifInput& request)
-{
-    const char* dialog = "Gui::Orba::FifDialog";
-    if (request.what.isEmpty()) {
-        printError(QCoreApplication::translate(dialog, "Empty Expression") + QStringLiteral(": ")
-                   + QCoreApplication::translate(
-                       dialog, "Please enter the search expression in the \"Find what:\" field."));
-        return false;
-    }
-    const QRegExp expression = request.getRegExp();
-    if (!expression.isValid()) {
-        const QString message = QCoreApplication::translate(dialog, "%1: \"%2\"")
-                                    .arg(expression.errorString(), request.what);
-        printError(QCoreApplication::translate(dialog, "Bad Expression") + QStringLiteral(": ")
-                   + message);
-        return false;
-    }
-    return true;
-}
 
 } // namespace
 
@@ -110,8 +80,12 @@ int main(int argc, char* argv[])
     }
 
     const FifInput request = commandLine.getRequest();
-    if (!checkExpression(request))
+    QString title;
+    QString message;
+    if (!request.check(&title, &message)) {
+        printError(title + QStringLiteral(": ") + message);
         return 2;
+    }
 
     FifManager manager;
     FifJob* job = manager.getJob(0);
@@ -127,7 +101,7 @@ int main(int argc, char* argv[])
             app.exit(2);
             return;
         }
-        printError(statusText(job));
+        printError(job->getResultText());
         app.exit(job->getLineHitCount() > 0 ? 0 : 1);
     });
     job->start(request);

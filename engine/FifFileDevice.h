@@ -39,6 +39,8 @@ public:
     qint64 readAt(char* data, qint64 size, qint64 position) const;
 
     static constexpr qint64 headSize = 64 * 1024;
+    // What the search reads at a time after the head.
+    static constexpr qint64 blockSize = 256 * 1024;
 
 protected:
     qint64 readData(char* data, qint64 maxSize) override;

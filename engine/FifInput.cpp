@@ -71,6 +71,23 @@ bool FifInput::isValid() const
     return !what.isEmpty() && getRegExp().isValid();
 }
 
+bool FifInput::check(QString* title, QString* message) const
+{
+    if (what.isEmpty()) {
+        *title = QObject::tr("Empty Expression");
+        *message = QObject::tr("Please enter the search expression in the \"Find what:\" field.");
+        return false;
+    }
+    const QRegExp rx = getRegExp();
+    if (!rx.isValid()) {
+        *title = QObject::tr("Bad Expression");
+        // One pass, so that a "%2" in Qt's error text stays as it is.
+        *message = QObject::tr("%1: \"%2\"").arg(rx.errorString(), what);
+        return false;
+    }
+    return true;
+}
+
 QRegExp FifInput::getRegExp() const
 {
     QRegExp rx;

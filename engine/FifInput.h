@@ -24,6 +24,10 @@ public:
 
     // A non-empty `what` whose expression Qt accepts.
     bool isValid() const;
+    // The same verdict with the reason for the user: on an unusable request,
+    // the title ("Empty Expression" or "Bad Expression") and the message
+    // that the find dialog and `fif` show.
+    bool check(QString* title, QString* message) const;
     // The expression every line is matched against.
     QRegExp getRegExp() const;
     // One line describing the request, empty when `what` is.

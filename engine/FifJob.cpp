@@ -102,6 +102,13 @@ int FifJob::getLineHitCount() const
     return hitsModel ? hitsModel->rowCount(QModelIndex()) : 0;
 }
 
+QString FifJob::getResultText() const
+{
+    return tr("Found %n line(s)", "", getLineHitCount())
+           + tr(" in %n file(s)", "", getFileHitCount())
+           + tr(" out of %n file(s)", "", getReadFileCount());
+}
+
 FifInput FifJob::getInput() const
 {
     return input;

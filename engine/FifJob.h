@@ -44,6 +44,9 @@ public:
     void incrementFileHitCount();
     // The number of rows of the hits model, 0 while there is none.
     int getLineHitCount() const;
+    // The counts of the search as the results view and `fif` show them at
+    // its end: "Found %n line(s) in %n file(s) out of %n file(s)".
+    QString getResultText() const;
 
     FifInput getInput() const;
     QDir getWorkingDir() const;

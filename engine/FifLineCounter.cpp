@@ -1,6 +1,6 @@
 #include "FifLineCounter.h"
 
-#include <QStringDecoder>
+#include "FifFileDecoder.h"
 
 #include <cstring>
 
@@ -128,16 +128,16 @@ qint64 FifLineCounter::wellFormedLength(const uchar* p, qint64 size)
     return length;
 }
 
-qint64 FifLineCounter::utf16Length(const char* bytes, qint64 size, QStringDecoder& decoder)
+qint64 FifLineCounter::utf16Length(const char* bytes, qint64 size, FifFileDecoder& decoder)
 {
     const qint64 length = wellFormedLength(reinterpret_cast<const uchar*>(bytes), size);
     if (length >= 0)
         return length;
-    return QString(decoder.decode(QByteArrayView(bytes, size))).size();
+    return decoder.decode(QByteArrayView(bytes, size)).size();
 }
 
 FifLineCounter::Counts FifLineCounter::count(const char* begin, const char* end,
-                                             QStringDecoder& decoder)
+                                             FifFileDecoder& decoder)
 {
     Counts counts;
     const Scan scan = scanBytes(reinterpret_cast<const uchar*>(begin), end - begin);

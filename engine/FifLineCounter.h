@@ -2,10 +2,10 @@
 
 #include <QtGlobal>
 
-class QStringDecoder;
-
 namespace Gui {
 namespace Orba {
+
+class FifFileDecoder;
 
 // Counts, in raw UTF-8 bytes holding whole lines (each ended by "\n"), what
 // the scan would have counted had it decoded and matched them: the lines,
@@ -24,11 +24,11 @@ public:
 
     // [begin, end) holds whole lines only: `end` follows a "\n". Lines that
     // are not well-formed UTF-8 are measured with `decoder`, which must be
-    // the scan's own (stateless, keeping a U+FEFF at the start of a line).
-    static Counts count(const char* begin, const char* end, QStringDecoder& decoder);
+    // the scan's own UTF-8 one.
+    static Counts count(const char* begin, const char* end, FifFileDecoder& decoder);
 
     // The UTF-16 length `decoder` gives `size` bytes.
-    static qint64 utf16Length(const char* bytes, qint64 size, QStringDecoder& decoder);
+    static qint64 utf16Length(const char* bytes, qint64 size, FifFileDecoder& decoder);
 
 private:
     // The UTF-16 length of well-formed UTF-8 free of non-characters, or -1.

@@ -3,7 +3,6 @@
 #include "FifLineCounter.h"
 
 #include <QIODevice>
-#include <QStringDecoder>
 
 #include <climits>
 #include <cstring>
@@ -44,28 +43,100 @@ qsizetype safeCut(const char* bytes, qsizetype cut)
     return cut;
 }
 
-QString decodeUtf8(QStringDecoder& decoder, const char* bytes, qsizetype size)
+// One line of UTF-8 as its pieces are read. Up to `maxBytes` of it are kept
+// for matching, cut where decoding the kept part alone gives what decoding
+// the whole does; the characters of the rest are only counted, a piece at a
+// time, so that memory stays bounded however long the line. Its last bytes
+// are held back from counting: they may be the "\r" of its terminator.
+class Utf8Line
 {
-    return decoder.decode(QByteArrayView(bytes, size));
-}
-
-// Characters that `bytes` decode to, decoded in pieces of bounded size.
-qint64 utf8Length(QStringDecoder& decoder, const char* bytes, qsizetype size)
-{
-    qint64 length = 0;
-    while (size > 0) {
-        qsizetype piece = size;
-        if (piece > 1024 * 1024) {
-            piece = safeCut(bytes, 1024 * 1024);
-            if (piece == 0)
-                piece = 1024 * 1024;
-        }
-        length += decodeUtf8(decoder, bytes, piece).size();
-        bytes += piece;
-        size -= piece;
+public:
+    Utf8Line(qint64 maxBytes, qint64 countPiece, FifFileDecoder& decoder)
+        : decoder(decoder)
+        , maxBytes(maxBytes)
+        , countPiece(countPiece)
+    {
     }
-    return length;
-}
+
+    bool isEmpty() const { return kept.isEmpty() && !overlong; }
+    bool isOverlong() const { return overlong; }
+    const QByteArray& keptBytes() const { return kept; }
+
+    void add(const char* bytes, qint64 size)
+    {
+        if (size <= 0)
+            return;
+        endsWithCR = bytes[size - 1] == '\r';
+        if (!overlong) {
+            const qint64 room = maxBytes - kept.size();
+            if (size <= room) {
+                kept.append(bytes, size);
+                return;
+            }
+            kept.append(bytes, room);
+            bytes += room;
+            size -= room;
+            overlong = true;
+            // Where the kept part ends, the decoding must not change.
+            const QByteArray around = kept.right(maxContinuation) + bytes[0];
+            const qsizetype back = around.size() - 1 - safeCut(around.constData(), around.size() - 1);
+            tail = kept.right(back);
+            kept.chop(back);
+        }
+        tail.append(bytes, size);
+        if (tail.size() > countPiece + heldBack) {
+            const qsizetype cut = safeCut(tail.constData(), tail.size() - heldBack);
+            if (cut > 0) {
+                restChars += FifLineCounter::utf16Length(tail.constData(), cut, decoder);
+                tail.remove(0, cut);
+            }
+        }
+    }
+
+    // Ends the line and gives the length of its terminator: 1 for "\n", 2
+    // for "\r\n" (the "\r" leaves the text), 0 at the end of the file.
+    int end(bool newline)
+    {
+        if (!newline)
+            return 0;
+        if (!endsWithCR)
+            return 1;
+        // An over-long line always holds its last bytes in the tail.
+        if (overlong)
+            tail.chop(1);
+        else
+            kept.chop(1);
+        return 2;
+    }
+
+    // The characters of the line beyond the kept bytes; after end().
+    qint64 countRest()
+    {
+        restChars += FifLineCounter::utf16Length(tail.constData(), tail.size(), decoder);
+        tail.resize(0);
+        return restChars;
+    }
+
+    // Keeps the buffers' memory for the next line.
+    void clear()
+    {
+        kept.resize(0);
+        tail.resize(0);
+        overlong = false;
+        endsWithCR = false;
+        restChars = 0;
+    }
+
+private:
+    FifFileDecoder& decoder;
+    const qint64 maxBytes;
+    const qint64 countPiece;
+    QByteArray kept;
+    QByteArray tail;         // bytes beyond the kept part not yet counted
+    bool overlong = false;   // the line has outgrown the kept part
+    bool endsWithCR = false; // the last byte of the line so far is "\r"
+    qint64 restChars = 0;    // characters beyond the kept part already counted
+};
 
 } // namespace
 
@@ -87,7 +158,7 @@ FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint6
     }
 }
 
-int FifLineScanner::indexIn(const QString& text, const StopPoll& shouldStop)
+int FifLineScanner::indexIn(const QString& text)
 {
     if (text.size() <= sliceThreshold || anchored.pattern().isEmpty())
         return rx.indexIn(text, 0, QRegExp::CaretAtZero);
@@ -95,7 +166,7 @@ int FifLineScanner::indexIn(const QString& text, const StopPoll& shouldStop)
     // and does so exactly when P matches there: P holds no caret, and every
     // other assertion sees the whole line as before.
     for (int start = 0; start <= text.size(); ++start) {
-        if (shouldStop && shouldStop()) {
+        if (stopRequested()) {
             stopped = true;
             return -1;
         }
@@ -105,68 +176,68 @@ int FifLineScanner::indexIn(const QString& text, const StopPoll& shouldStop)
     return -1;
 }
 
-bool FifLineScanner::scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop)
+bool FifLineScanner::scan(QIODevice& device, const MatchSink& matchSink,
+                          const StopPoll& shouldStop)
 {
+    sink = &matchSink;
+    stopPoll = &shouldStop;
+    stopped = false;
+    hasHit = false;
     lineNumber = 1;
     offset = 0;
     rawOffset = 0;
-    // The same byte-order-mark detection as QTextStream's, so that the text
-    // test and the scan read a file alike.
-    const auto encoding = QStringConverter::encodingForData(device.peek(4));
-    if (encoding) {
-        switch (*encoding) {
-        case QStringConverter::Utf16LE:
-        case QStringConverter::Utf16BE:
-            device.skip(2);
-            return scanDecoded(device, *encoding, 2, sink, shouldStop);
-        case QStringConverter::Utf32LE:
-        case QStringConverter::Utf32BE:
-            device.skip(4);
-            return scanDecoded(device, *encoding, 4, sink, shouldStop);
-        case QStringConverter::Utf8:
-            device.skip(3);
-            break;
-        default:
-            break;
-        }
-    }
-    return scanUtf8(device, sink, shouldStop);
+    FifFileDecoder decoder(device.peek(4));
+    device.skip(decoder.getMarkSize());
+    if (decoder.getUnitSize() == 1)
+        scanUtf8(device, decoder);
+    else
+        scanDecoded(device, decoder);
+    sink = nullptr;
+    stopPoll = nullptr;
+    return hasHit;
 }
 
-bool FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars,
-                               const MatchSink& sink, const StopPoll& shouldStop)
+template <typename Take>
+bool FifLineScanner::readBlocks(QIODevice& device, Take take)
 {
-    bool matched = false;
-    const int position = indexIn(text, shouldStop);
+    for (bool first = true;; first = false) {
+        // A single line may span many blocks; a stop must not wait for its end.
+        if (!first && stopRequested())
+            return false;
+        // Read into the buffer not holding lines still to be counted.
+        QByteArray& buffer = buffers[current];
+        current = 1 - current;
+        if (buffer.size() != blockSize)
+            buffer.resize(blockSize);
+        const qint64 got = device.read(buffer.data(), blockSize);
+        if (got <= 0)
+            return true;
+        if (!take(buffer.constData(), got))
+            return false;
+    }
+}
+
+void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars)
+{
+    const int position = indexIn(text);
     if (position >= 0) {
-        matched = true;
-        sink(Match{clampToInt(lineNumber), clampToInt(offset + position),
-                   clampToInt(rawOffset + position), text});
+        hasHit = true;
+        (*sink)(Match{clampToInt(lineNumber), clampToInt(offset + position),
+                      clampToInt(rawOffset + position), text});
     }
-    const qint64 length = text.size() + extraChars;
-    offset += length + (terminatorLength > 0 ? 1 : 0);
-    rawOffset += length + terminatorLength;
-    ++lineNumber;
-    return matched;
+    advance(text.size() + extraChars, terminatorLength);
 }
 
-bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
-                              const StopPoll& shouldStop)
+void FifLineScanner::advance(qint64 chars, int terminatorLength)
 {
-    bool hasHit = false;
-    // Stateless, so that pieces decode alike wherever they are cut; and,
-    // unlike QString::fromUtf8(), keeping a U+FEFF at the start of a line:
-    // only the one that starts the file is a byte-order mark.
-    QStringDecoder decoder(QStringDecoder::Utf8,
-                           QStringDecoder::Flag::Stateless
-                               | QStringDecoder::Flag::ConvertInitialBom);
-    QByteArray line;          // the kept part of the line being read
-    bool overlong = false;    // the line has outgrown the kept part
-    QByteArray tail;          // bytes beyond the kept part not yet counted
-    qint64 skippedChars = 0;  // characters beyond the kept part already counted
-    bool endsWithCR = false;  // the last byte of the line so far is "\r"
+    offset += chars + (terminatorLength > 0 ? 1 : 0);
+    rawOffset += chars + terminatorLength;
+    ++lineNumber;
+}
 
-    auto stopRequested = [&] { return shouldStop && shouldStop(); };
+void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
+{
+    Utf8Line line(maxLineBytes, blockSize, decoder);
 
     // Whole lines that cannot match are not decoded; the counters pass over
     // them as matching them would have. Those after the last candidate of a
@@ -194,101 +265,37 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
         return pollDue;
     };
 
-    auto finishLine = [&](bool hasNewline) {
-        int terminator = hasNewline ? 1 : 0;
-        if (hasNewline && endsWithCR) {
-            terminator = 2;
-            // An over-long line always holds its last bytes in the tail.
-            if (overlong)
-                tail.chop(1);
-            else
-                line.chop(1);
-        }
+    // Matches the line read so far, or passes over one that cannot match;
+    // false when a stop came while it was matched.
+    auto finishLine = [&](bool newline) {
+        const int terminator = line.end(newline);
+        const QByteArray& bytes = line.keptBytes();
+        const char* end = bytes.constData() + bytes.size();
         FifPrefilter::Cursor cursor;
-        const char* lineEnd = line.constData() + line.size();
-        if (usePrefilter && !overlong
-            && prefilter.find(line.constData(), lineEnd, cursor) == lineEnd) {
-            // Cannot match. Only a line after it needs its length.
-            if (hasNewline) {
+        if (usePrefilter && !line.isOverlong()
+            && prefilter.find(bytes.constData(), end, cursor) == end) {
+            // Only a line after it needs its length.
+            if (newline) {
                 settle();
-                const qint64 length =
-                    FifLineCounter::utf16Length(line.constData(), line.size(), decoder);
-                offset += length + 1;
-                rawOffset += length + terminator;
-                ++lineNumber;
+                advance(FifLineCounter::utf16Length(bytes.constData(), bytes.size(), decoder),
+                        terminator);
             }
         } else {
             settle();
-            if (!tail.isEmpty())
-                skippedChars += utf8Length(decoder, tail.constData(), tail.size());
-            if (matchLine(decodeUtf8(decoder, line.constData(), line.size()), terminator,
-                          skippedChars, sink, shouldStop))
-                hasHit = true;
+            const qint64 rest = line.countRest();
+            matchLine(decoder.decode(bytes), terminator, rest);
         }
-        // Keep the buffers' memory for the next line.
-        line.resize(0);
-        tail.resize(0);
-        overlong = false;
-        skippedChars = 0;
-        endsWithCR = false;
+        line.clear();
+        return !stopped;
     };
-
-    auto addToLine = [&](const char* bytes, qint64 size) {
-        if (size <= 0)
-            return;
-        endsWithCR = bytes[size - 1] == '\r';
-        if (!overlong) {
-            const qint64 room = maxLineBytes - line.size();
-            if (size <= room) {
-                line.append(bytes, size);
-                return;
-            }
-            line.append(bytes, room);
-            bytes += room;
-            size -= room;
-            overlong = true;
-            // Where the kept part ends, the decoding must not change.
-            const QByteArray around = line.right(maxContinuation) + bytes[0];
-            const qsizetype back = around.size() - 1 - safeCut(around.constData(), around.size() - 1);
-            tail = line.right(back);
-            line.chop(back);
-        }
-        tail.append(bytes, size);
-        // Count the tail in pieces; the last bytes stay, as they may be the
-        // "\r" of the terminator.
-        if (tail.size() > blockSize + heldBack) {
-            const qsizetype cut = safeCut(tail.constData(), tail.size() - heldBack);
-            if (cut > 0) {
-                skippedChars += utf8Length(decoder, tail.constData(), cut);
-                tail.remove(0, cut);
-            }
-        }
-    };
-
-    auto pending = [&] { return !line.isEmpty() || overlong; };
 
     // Matches the whole lines of [begin, end), each ended by "\n"; false
-    // when a stop was requested. With a prefilter only the lines it points
-    // at are decoded and matched.
+    // when a stop was requested. Only the lines the prefilter points at
+    // are decoded and matched.
     auto scanLines = [&](const char* begin, const char* end) {
-        if (!usePrefilter) {
-            while (begin < end) {
-                const char* newline =
-                    static_cast<const char*>(std::memchr(begin, '\n', size_t(end - begin)));
-                if (lineNumber % pollInterval == 0 && stopRequested())
-                    return false;
-                addToLine(begin, newline - begin);
-                finishLine(true);
-                // A stop that came while a long line was matched ends here.
-                if (stopped)
-                    return false;
-                begin = newline + 1;
-            }
-            return true;
-        }
         FifPrefilter::Cursor cursor;
         while (begin < end) {
-            const char* candidate = prefilter.find(begin, end, cursor);
+            const char* candidate = usePrefilter ? prefilter.find(begin, end, cursor) : begin;
             if (candidate == end)
                 break;
             const char* lineStart = static_cast<const char*>(
@@ -300,9 +307,8 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
             pollDue = passOver(begin, lineStart) || pollDue;
             if ((pollDue || lineNumber % pollInterval == 0) && stopRequested())
                 return false;
-            addToLine(lineStart, newline - lineStart);
-            finishLine(true);
-            if (stopped)
+            line.add(lineStart, newline - lineStart);
+            if (!finishLine(true))
                 return false;
             begin = newline + 1;
         }
@@ -311,95 +317,49 @@ bool FifLineScanner::scanUtf8(QIODevice& device, const MatchSink& sink,
         return true;
     };
 
-    bool firstBlock = true;
-    int current = 0;
-    while (true) {
-        // A single line may span many blocks; a stop must not wait for its end.
-        if (!firstBlock && stopRequested())
-            return hasHit;
-        firstBlock = false;
-        // Read into the buffer not holding uncounted lines.
-        QByteArray& buffer = buffers[current];
-        current = 1 - current;
-        if (buffer.size() != blockSize)
-            buffer.resize(blockSize);
-        const qint64 got = device.read(buffer.data(), blockSize);
+    const bool atEnd = readBlocks(device, [&](const char* data, qint64 size) {
         if (settle() && stopRequested())
-            return hasHit;
-        if (got <= 0)
-            break;
-        const char* data = buffer.constData();
-        const char* end = data + got;
+            return false;
+        const char* end = data + size;
         // The end of a line begun in an earlier block.
-        if (pending()) {
+        if (!line.isEmpty()) {
             const char* newline =
                 static_cast<const char*>(std::memchr(data, '\n', size_t(end - data)));
             if (!newline) {
-                addToLine(data, end - data);
-                continue;
+                line.add(data, end - data);
+                return true;
             }
             if (lineNumber % pollInterval == 0 && stopRequested())
-                return hasHit;
-            addToLine(data, newline - data);
-            finishLine(true);
-            if (stopped)
-                return hasHit;
+                return false;
+            line.add(data, newline - data);
+            if (!finishLine(true))
+                return false;
             data = newline + 1;
         }
         const char* lastNewline =
             static_cast<const char*>(memrchr(data, '\n', size_t(end - data)));
         const char* whole = lastNewline ? lastNewline + 1 : data;
         if (!scanLines(data, whole))
-            return hasHit;
-        addToLine(whole, end - whole);
+            return false;
+        line.add(whole, end - whole);
+        return true;
+    });
+    if (atEnd && !line.isEmpty()) {
+        const bool pollDue = settle();
+        if (!((pollDue || lineNumber % pollInterval == 0) && stopRequested()))
+            finishLine(false);
     }
-    if (pending()) {
-        if (lineNumber % pollInterval == 0 && stopRequested())
-            return hasHit;
-        finishLine(false);
-    }
-    return hasHit;
 }
 
-bool FifLineScanner::scanDecoded(QIODevice& device, QStringConverter::Encoding encoding,
-                                 int unitBytes, const MatchSink& sink,
-                                 const StopPoll& shouldStop)
+void FifLineScanner::scanDecoded(QIODevice& device, FifFileDecoder& decoder)
 {
-    bool hasHit = false;
-    // The byte-order mark has been skipped; a U+FEFF that follows it, or that
-    // starts a later block, is text.
-    QStringDecoder decoder(encoding, QStringDecoder::Flag::Stateless
-                                         | QStringDecoder::Flag::ConvertInitialBom);
-    // Stateless decoding would spoil a code unit split between reads, so
-    // only whole code units are decoded and the rest is carried over.
-    QByteArray carry;
     QString line;
-    bool overlong = false;
-    qint64 skippedChars = 0;
-    bool endsWithCR = false;
+    bool overlong = false;    // the line has outgrown `line`
+    qint64 restChars = 0;     // characters of the line beyond `line`
+    bool endsWithCR = false;  // the last character of the line so far is "\r"
     const qint64 maxLineChars = qMax<qint64>(maxLineBytes / 2, 1);
 
-    auto stopRequested = [&] { return shouldStop && shouldStop(); };
-
-    auto finishLine = [&](bool hasNewline) {
-        int terminator = hasNewline ? 1 : 0;
-        if (hasNewline && endsWithCR) {
-            terminator = 2;
-            // Once a line is over-long, its last characters are skipped ones.
-            if (overlong)
-                --skippedChars;
-            else
-                line.chop(1);
-        }
-        if (matchLine(line, terminator, skippedChars, sink, shouldStop))
-            hasHit = true;
-        line.clear();
-        overlong = false;
-        skippedChars = 0;
-        endsWithCR = false;
-    };
-
-    auto addToLine = [&](QStringView chars) {
+    auto add = [&](QStringView chars) {
         if (chars.isEmpty())
             return;
         endsWithCR = chars.back() == QLatin1Char('\r');
@@ -412,56 +372,55 @@ bool FifLineScanner::scanDecoded(QIODevice& device, QStringConverter::Encoding e
             // between two reads.
             if (overlong && !line.isEmpty() && line.back().isHighSurrogate()) {
                 line.chop(1);
-                ++skippedChars;
+                ++restChars;
             }
         }
-        skippedChars += chars.size() - take;
+        restChars += chars.size() - take;
     };
 
-    bool firstBlock = true;
-    while (true) {
-        if (!firstBlock && stopRequested())
-            return hasHit;
-        firstBlock = false;
-        const QByteArray block = device.read(blockSize);
-        if (block.isEmpty())
-            break;
-        QByteArray bytes = carry + block;
-        carry.clear();
-        const qsizetype odd = bytes.size() % unitBytes;
-        if (odd) {
-            carry = bytes.right(odd);
-            bytes.chop(odd);
+    auto finishLine = [&](bool newline) {
+        int terminator = newline ? 1 : 0;
+        if (newline && endsWithCR) {
+            terminator = 2;
+            // Once a line is over-long, its last characters are counted ones.
+            if (overlong)
+                --restChars;
+            else
+                line.chop(1);
         }
-        const QString text = decoder.decode(bytes);
+        matchLine(line, terminator, restChars);
+        line.clear();
+        overlong = false;
+        restChars = 0;
+        endsWithCR = false;
+        return !stopped;
+    };
+
+    const bool atEnd = readBlocks(device, [&](const char* data, qint64 size) {
+        const QString text = decoder.decode(QByteArrayView(data, size));
         const QStringView view(text);
         qsizetype start = 0;
         while (start < view.size()) {
             const qsizetype newline = view.indexOf(QLatin1Char('\n'), start);
             if (newline < 0) {
-                addToLine(view.mid(start));
+                add(view.mid(start));
                 break;
             }
             if (lineNumber % pollInterval == 0 && stopRequested())
-                return hasHit;
-            addToLine(view.mid(start, newline - start));
-            finishLine(true);
-            if (stopped)
-                return hasHit;
+                return false;
+            add(view.mid(start, newline - start));
+            if (!finishLine(true))
+                return false;
             start = newline + 1;
         }
-    }
+        return true;
+    });
+    if (!atEnd)
+        return;
     // A file that ends inside a code unit ends with an undecodable character.
-    if (!carry.isEmpty()) {
-        const QChar replacement(QChar::ReplacementCharacter);
-        addToLine(QStringView(&replacement, 1));
-    }
-    if (!line.isEmpty() || overlong) {
-        if (lineNumber % pollInterval == 0 && stopRequested())
-            return hasHit;
+    add(decoder.finish());
+    if ((!line.isEmpty() || overlong) && !(lineNumber % pollInterval == 0 && stopRequested()))
         finishLine(false);
-    }
-    return hasHit;
 }
 
 } // namespace Orba

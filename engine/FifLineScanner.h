@@ -1,9 +1,10 @@
 #pragma once
 
+#include "FifFileDecoder.h"
+#include "FifFileDevice.h"
 #include "FifPrefilter.h"
 
 #include <QString>
-#include <QStringConverter>
 #include <QtCore5Compat/QRegExp>
 
 #include <functional>
@@ -42,7 +43,7 @@ public:
     // about this many bytes are kept for matching (memory stays bounded), and
     // the numbers and offsets of later lines stay true.
     static constexpr qint64 defaultMaxLineBytes = 16 * 1024 * 1024;
-    static constexpr qint64 defaultBlockSize = 256 * 1024;
+    static constexpr qint64 defaultBlockSize = FifFileDevice::blockSize;
     static constexpr int pollInterval = 100;
     // Qt's regular-expression engine takes time quadratic in the line's
     // length for many patterns (a*b, .*x, nested repetition) when a line
@@ -66,16 +67,21 @@ public:
     bool isPrefilterEnabled() const { return usePrefilter; }
 
 private:
-    bool scanUtf8(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
-    bool scanDecoded(QIODevice& device, QStringConverter::Encoding encoding, int unitBytes,
-                     const MatchSink& sink, const StopPoll& shouldStop);
+    // Reads the rest of the device a block at a time and hands each block to
+    // `take`, until the end (true), a stop request before a further block or
+    // `take` refusing (false).
+    template <typename Take>
+    bool readBlocks(QIODevice& device, Take take);
+    void scanUtf8(QIODevice& device, FifFileDecoder& decoder);
+    void scanDecoded(QIODevice& device, FifFileDecoder& decoder);
     // Matches one line and advances the counters past it. `extraChars` are
     // characters of the line that were not kept in `text`.
-    bool matchLine(const QString& text, int terminatorLength, qint64 extraChars,
-                   const MatchSink& sink, const StopPoll& shouldStop);
+    void matchLine(const QString& text, int terminatorLength, qint64 extraChars);
+    void advance(qint64 chars, int terminatorLength);
     // The first match in `text`, as rx.indexIn() with QRegExp::CaretAtZero
     // finds it; sets `stopped` when a stop request ends the search first.
-    int indexIn(const QString& text, const StopPoll& shouldStop);
+    int indexIn(const QString& text);
+    bool stopRequested() const { return *stopPoll && (*stopPoll)(); }
 
     QRegExp rx;
     FifPrefilter prefilter;
@@ -84,11 +90,17 @@ private:
     qint64 blockSize;
     // Two, so that a block passed over can be counted after the next read.
     QByteArray buffers[2];
+    int current = 0;
     // rx anchored at the offset searched from, when that gives the same
     // matches: a regular expression without any '^', which could otherwise
     // mean the start of the line. Invalid when lines are matched whole.
     QRegExp anchored;
+
+    // The scan under way.
+    const MatchSink* sink = nullptr;
+    const StopPoll* stopPoll = nullptr;
     bool stopped = false;
+    bool hasHit = false;
     qint64 lineNumber = 1;
     qint64 offset = 0;
     qint64 rawOffset = 0;

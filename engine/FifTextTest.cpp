@@ -1,5 +1,7 @@
 #include "FifTextTest.h"
 
+#include "FifFileDecoder.h"
+
 #include <cstring>
 
 #ifdef __SSE2__
@@ -11,14 +13,10 @@ namespace Orba {
 
 namespace {
 
-// Lead bytes of the byte-order marks QTextStream detects besides UTF-8's.
+// A UTF-16 or UTF-32 byte-order mark.
 bool startsOtherBom(const char* head, qint64 size)
 {
-    const auto* h = reinterpret_cast<const uchar*>(head);
-    if (size >= 2 && ((h[0] == 0xFF && h[1] == 0xFE) || (h[0] == 0xFE && h[1] == 0xFF)))
-        return true;
-    // UTF-32 big-endian: 00 00 FE FF.
-    return size >= 4 && h[0] == 0 && h[1] == 0 && h[2] == 0xFE && h[3] == 0xFF;
+    return FifFileDecoder(QByteArrayView(head, size)).getUnitSize() > 1;
 }
 
 // Bytes that are control characters on their own (tab, line feed, vertical

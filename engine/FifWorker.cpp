@@ -118,7 +118,7 @@ bool FifWorker::isTextFile(FifFileDevice& file)
     const QByteArray& head = file.head();
     FifTextTest::Verdict verdict = test.feed(head.constData(), head.size());
     if (verdict == FifTextTest::Undecided && head.size() == FifFileDevice::headSize) {
-        QByteArray more(256 * 1024, Qt::Uninitialized);
+        QByteArray more(FifFileDevice::blockSize, Qt::Uninitialized);
         qint64 position = head.size();
         while (verdict == FifTextTest::Undecided) {
             const qint64 got = file.readAt(more.data(), more.size(), position);
@@ -150,7 +150,7 @@ bool FifWorker::isTextByStream(const QString& path)
             break;
         for (const QChar c : piece) {
             if (c == QLatin1Char('\n')) {
-                if (++lines == 20)
+                if (++lines == FifTextTest::linesExamined)
                     return true;
             } else if (c.category() == QChar::Other_Control && !c.isSpace()) {
                 return false;

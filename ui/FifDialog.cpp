@@ -159,19 +159,8 @@ void FifDialog::on_append_clicked()
 
 void FifDialog::onStartClicked()
 {
-    const QString what = form->what->currentText();
-    if (what.isEmpty()) {
-        QMessageBox::critical(this, tr("Empty Expression"),
-                              tr("Please enter the search expression in the \"Find what:\" field."),
-                              QMessageBox::Ok, QMessageBox::NoButton);
-        form->what->setFocus(Qt::OtherFocusReason);
-        return;
-    }
-    if (!job)
-        return;
-
     FifInput request{QString()};
-    request.what = what;
+    request.what = form->what->currentText();
     request.matchCase = form->matchCase->isChecked() ? Qt::CaseSensitive : Qt::CaseInsensitive;
     if (form->literal->isChecked())
         request.matchType = QRegExp::FixedString;
@@ -181,16 +170,17 @@ void FifDialog::onStartClicked()
         request.matchType = QRegExp::RegExp2;
     request.matchWord = form->matchWord->isChecked();
 
-    const QRegExp regExp = request.getRegExp();
-    if (!regExp.isValid()) {
-        const QString message = tr("%1: \"%2\"").arg(regExp.errorString(), what);
-        QMessageBox::critical(this, tr("Bad Expression"), message,
-                              QMessageBox::Ok, QMessageBox::NoButton);
+    QString title;
+    QString message;
+    if (!request.check(&title, &message)) {
+        QMessageBox::critical(this, title, message, QMessageBox::Ok, QMessageBox::NoButton);
         form->what->setFocus(Qt::OtherFocusReason);
         if (QLineEdit* edit = form->what->lineEdit())
             edit->selectAll();
         return;
     }
+    if (!job)
+        return;
 
     request.where = form->where->currentText();
     request.filter = form->filter->currentText();

@@ -291,10 +291,7 @@ void FifHitsView::onEnded()
 {
     if (!job)
         return;
-    const QString status = tr("Found %n line(s)", "", job->getLineHitCount())
-                         + tr(" in %n file(s)", "", job->getFileHitCount())
-                         + tr(" out of %n file(s)", "", job->getReadFileCount());
-    statusLabel->setText(status);
+    statusLabel->setText(job->getResultText());
     chaseWidget->setAnimated(false);
     chaseWidgetAction->setVisible(false);
     setLinkedEnabled(stopAction, linkedStopAction, false);
