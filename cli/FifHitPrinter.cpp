@@ -35,11 +35,6 @@ FifHitPrinter::FifHitPrinter(QAbstractItemModel* hitsModel, FILE* output, QObjec
     }
 }
 
-bool FifHitPrinter::isClosed() const
-{
-    return closed;
-}
-
 int FifHitPrinter::getWriteError() const
 {
     return writeError;
@@ -84,9 +79,8 @@ void FifHitPrinter::writeFailed(int error)
     if (failed)
         return;
     failed = true;
-    if (error == EPIPE)
-        closed = true;
-    else
+    // A reader that went away is no error: the search just ends.
+    if (error != EPIPE)
         writeError = error ? error : EIO;
     emit outputFailed();
 }

@@ -20,9 +20,6 @@ class FifHitPrinter : public QObject
 public:
     FifHitPrinter(QAbstractItemModel* model, FILE* stream, QObject* parent = nullptr);
 
-    // Whether writing failed, or could not go on, because the reader of a
-    // pipe went away.
-    bool isClosed() const;
     // Errors other than a closed reader; 0 when there were none.
     int getWriteError() const;
 
@@ -39,7 +36,6 @@ private:
     FILE* stream;
     int nextRow = 0;
     bool failed = false;
-    bool closed = false;
     int writeError = 0;
     QTimer readerCheck;
 };

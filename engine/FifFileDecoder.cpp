@@ -34,7 +34,8 @@ QString FifFileDecoder::decode(QByteArrayView bytes)
 {
     if (unitSize == 1)
         return decoder.decode(bytes);
-    QByteArray units = carry + bytes;
+    QByteArray units = carry;
+    units.append(bytes);
     const qsizetype cut = units.size() % unitSize;
     carry = units.right(cut);
     units.chop(cut);

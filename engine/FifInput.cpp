@@ -1,9 +1,7 @@
 #include "FifInput.h"
 
 #include "FifSettings.h"
-#include "Settings.h"
 
-#include <QCoreApplication>
 #include <QDir>
 
 namespace Gui {
@@ -23,31 +21,6 @@ QString wildcardToRegExp(const QString& pattern)
 QString wordBounded(const QString& pattern)
 {
     return QLatin1String("\\b(") + pattern + QLatin1String(")\\b");
-}
-
-// A stored value counts only when Qt can read it as the field's type; one of
-// another kind (a list where a flag belongs, text where a number belongs) is
-// passed over like a missing one.
-bool readBool(const QVariant& value, bool* result)
-{
-    if (value.isNull())
-        return false;
-    QVariant converted = value;
-    if (!converted.convert(QMetaType::fromType<bool>()))
-        return false;
-    *result = converted.toBool();
-    return true;
-}
-
-bool readInt(const QVariant& value, int* result)
-{
-    if (value.isNull())
-        return false;
-    bool ok = false;
-    const int number = value.toInt(&ok);
-    if (ok)
-        *result = number;
-    return ok;
 }
 
 } // namespace
@@ -154,46 +127,7 @@ QString FifInput::toString() const
 
 void FifInput::setContents(Settings* settings)
 {
-    if (!settings)
-        return;
-    const FifSettings keys;
-
-    const QString storedWhat = keys.getWhatString(settings);
-    if (!storedWhat.isEmpty())
-        what = storedWhat;
-    const QString storedWhere = keys.getWhereString(settings);
-    if (!storedWhere.isEmpty())
-        where = storedWhere;
-    const QString storedFilter = keys.getFilterString(settings);
-    if (!storedFilter.isEmpty())
-        filter = storedFilter;
-
-    bool flag = false;
-    if (readBool(settings->getValue(keys.getMatchCaseKeyPath(), QVariant()), &flag))
-        matchCase = flag ? Qt::CaseSensitive : Qt::CaseInsensitive;
-    if (readBool(settings->getValue(keys.getMatchWordKeyPath(), QVariant()), &flag))
-        matchWord = flag;
-
-    int storedType = 0;
-    if (readInt(settings->getValue(keys.getMatchTypeKeyPath(), QVariant()), &storedType)) {
-        // The store keeps RegExp (0) where a request carries RegExp2.
-        switch (storedType) {
-        case QRegExp::RegExp:
-            matchType = QRegExp::RegExp2;
-            break;
-        case QRegExp::Wildcard:
-            matchType = QRegExp::Wildcard;
-            break;
-        case QRegExp::FixedString:
-            matchType = QRegExp::FixedString;
-            break;
-        default:
-            break;
-        }
-    }
-
-    if (readBool(settings->getValue(keys.getIncludeSubFolderKeyPath(), QVariant()), &flag))
-        includeSubFolders = flag;
+    FifSettings().readInput(settings, *this);
 }
 
 } // namespace Orba

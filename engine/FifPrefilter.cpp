@@ -212,7 +212,7 @@ FifPrefilter::FifPrefilter(const QRegExp& rx)
         if (c.unicode() >= 0x80 || c == QLatin1Char('\n') || c.unicode() == 0)
             return;
     }
-    caseSensitive = rx.caseSensitivity() == Qt::CaseSensitive;
+    const bool caseSensitive = rx.caseSensitivity() == Qt::CaseSensitive;
     needle = literal.toLatin1();
     foldMask = QByteArray(needle.size(), '\0');
     if (!caseSensitive) {

@@ -28,7 +28,6 @@ public:
     bool isActive() const { return !needle.isEmpty(); }
     // The piece every match contains; empty when inactive.
     QByteArray getNeedle() const { return needle; }
-    bool isCaseSensitive() const { return caseSensitive; }
 
     // Remembers where the special characters were last seen, so that a
     // buffer is searched for them once, not once per candidate.
@@ -53,7 +52,6 @@ private:
     const char* findSpecial(const char* begin, const char* end) const;
 
     QByteArray needle;  // lower case when case is ignored
-    bool caseSensitive = true;
     // 0x20 where the needle's byte is a letter compared without case.
     QByteArray foldMask;
     QList<QByteArray> specials;  // UTF-8 of the non-ASCII equivalents

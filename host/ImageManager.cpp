@@ -1,9 +1,23 @@
 #include "ImageManager.h"
 
+#include <QCoreApplication>
 #include <QFile>
+#include <QHash>
 
 namespace Gui {
 namespace Orba {
+
+namespace {
+
+// One icon per id for the whole run: a new QIcon for the same file would be
+// rendered again, and its pixmaps cached again beside the earlier ones.
+QHash<QString, QIcon>& icons()
+{
+    static QHash<QString, QIcon> made;
+    return made;
+}
+
+} // namespace
 
 ImageManager* ImageManager::getInstance()
 {
@@ -13,10 +27,16 @@ ImageManager* ImageManager::getInstance()
 
 QIcon ImageManager::getIcon(const QString& id) const
 {
-    const QString path = QStringLiteral(":/icons/%1.svg").arg(id);
-    if (!QFile::exists(path))
-        return QIcon();
-    return QIcon(path);
+    auto found = icons().constFind(id);
+    if (found == icons().constEnd()) {
+        if (icons().isEmpty()) {
+            // Icons are let go with the application that painted them.
+            qAddPostRoutine([] { icons().clear(); });
+        }
+        const QString path = QStringLiteral(":/icons/%1.svg").arg(id);
+        found = icons().insert(id, QFile::exists(path) ? QIcon(path) : QIcon());
+    }
+    return *found;
 }
 
 } // namespace Orba

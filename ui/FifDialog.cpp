@@ -86,17 +86,9 @@ FifDialog::~FifDialog()
 void FifDialog::setInput(const FifInput& input)
 {
     selectOrAdd(*form->what, input.what);
-    form->matchCase->setCheckState(checkState(input.matchCase == Qt::CaseSensitive));
-    if (input.matchType == QRegExp::FixedString)
-        form->literal->setChecked(true);
-    else if (input.matchType == QRegExp::Wildcard)
-        form->wildcard->setChecked(true);
-    else
-        form->regexp->setChecked(true);
-    form->matchWord->setCheckState(checkState(input.matchWord));
+    showOptions(input);
     selectOrAdd(*form->where, input.where);
     selectOrAdd(*form->filter, input.filter);
-    form->includeSubDir->setCheckState(checkState(input.includeSubFolders));
 }
 
 void FifDialog::setFilters(const QStringList& filters)
@@ -191,7 +183,8 @@ void FifDialog::onStartClicked()
         updateButtons();
         return;
     }
-    writeSettings();
+    if (settings)
+        keys.writeInput(settings, request, takeHistory(*form->what), takeHistory(*form->where));
     close();
 }
 
@@ -247,77 +240,34 @@ void FifDialog::readSettings()
 {
     if (!settings)
         return;
-
-    readComboBoxSettings(keys.getFindWhatKeyPath(), *form->what);
+    showHistory(*form->what, keys.getWhatHistory(settings));
     if (QLineEdit* edit = form->what->lineEdit())
         edit->selectAll();
-
-    QVariant value = settings->getValue(keys.getMatchCaseKeyPath(), QVariant());
-    if (!value.isNull()) {
-        const bool matchCase = value.toBool();
-        form->matchCase->setChecked(matchCase);
-        if (QCompleter* completer = form->what->completer())
-            completer->setCaseSensitivity(matchCase ? Qt::CaseSensitive : Qt::CaseInsensitive);
-    }
-
-    value = settings->getValue(keys.getMatchWordKeyPath(), QVariant());
-    if (!value.isNull())
-        form->matchWord->setChecked(value.toBool());
-
-    value = settings->getValue(keys.getMatchTypeKeyPath(), QVariant());
-    if (!value.isNull()) {
-        switch (value.toInt()) {
-        case QRegExp::RegExp:
-            form->regexp->setChecked(true);
-            break;
-        case QRegExp::Wildcard:
-            form->wildcard->setChecked(true);
-            break;
-        case QRegExp::FixedString:
-            form->literal->setChecked(true);
-            break;
-        default:
-            break;
-        }
-    }
-
-    readComboBoxSettings(keys.getWhereKeyPath(), *form->where);
+    // Starts from the form's own defaults, which a request shares.
+    FifInput stored;
+    keys.readInput(settings, stored);
+    showOptions(stored);
+    showHistory(*form->where, keys.getWhereHistory(settings));
     form->filter->setCurrentIndex(0);
-
-    value = settings->getValue(keys.getIncludeSubFolderKeyPath(), QVariant());
-    if (!value.isNull())
-        form->includeSubDir->setChecked(value.toBool());
 }
 
-void FifDialog::writeSettings()
+void FifDialog::showOptions(const FifInput& input)
 {
-    if (!settings)
-        return;
-
-    writeComboBoxSettings(keys.getFindWhatKeyPath(), *form->what);
-    settings->setValue(keys.getMatchCaseKeyPath(), form->matchCase->isChecked());
-    settings->setValue(keys.getMatchWordKeyPath(), form->matchWord->isChecked());
-    int matchType = QRegExp::FixedString;
-    if (form->regexp->isChecked())
-        matchType = QRegExp::RegExp;
-    else if (form->wildcard->isChecked())
-        matchType = QRegExp::Wildcard;
-    settings->setValue(keys.getMatchTypeKeyPath(), matchType);
-    writeComboBoxSettings(keys.getWhereKeyPath(), *form->where);
-    const QString filter = form->filter->currentText();
-    if (!filter.isEmpty())
-        settings->setValue(keys.getFilterKeyPath(), filter);
-    settings->setValue(keys.getIncludeSubFolderKeyPath(), form->includeSubDir->isChecked());
+    const bool matchCase = input.matchCase == Qt::CaseSensitive;
+    form->matchCase->setCheckState(checkState(matchCase));
+    onMatchCaseChanged(form->matchCase->checkState());
+    if (input.matchType == QRegExp::FixedString)
+        form->literal->setChecked(true);
+    else if (input.matchType == QRegExp::Wildcard)
+        form->wildcard->setChecked(true);
+    else
+        form->regexp->setChecked(true);
+    form->matchWord->setCheckState(checkState(input.matchWord));
+    form->includeSubDir->setCheckState(checkState(input.includeSubFolders));
 }
 
-void FifDialog::readComboBoxSettings(const QString& key, QComboBox& box)
+void FifDialog::showHistory(QComboBox& box, const QStringList& entries)
 {
-    if (key.isEmpty())
-        return;
-    const QVariant value = settings->getValue(key, QVariant());
-    if (value.isNull())
-        return;
-    const QStringList entries = value.toStringList();
     QLineEdit* edit = box.lineEdit();
     if (entries.isEmpty() || !edit)
         return;
@@ -330,10 +280,8 @@ void FifDialog::readComboBoxSettings(const QString& key, QComboBox& box)
         box.setEditText(typed);
 }
 
-void FifDialog::writeComboBoxSettings(const QString& key, QComboBox& box)
+QStringList FifDialog::takeHistory(QComboBox& box)
 {
-    if (key.isEmpty())
-        return;
     if (box.lineEdit()) {
         putOnTop(box, box.lineEdit()->text());
         box.setCurrentIndex(0);
@@ -342,7 +290,7 @@ void FifDialog::writeComboBoxSettings(const QString& key, QComboBox& box)
     entries.reserve(box.count());
     for (int i = 0; i < box.count(); ++i)
         entries << box.itemText(i);
-    settings->setValue(key, QVariant(entries));
+    return entries;
 }
 
 } // namespace Orba

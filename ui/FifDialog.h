@@ -57,9 +57,11 @@ private:
     QString getLastDir(const QString& where) const;
     QString chooseFolder();
     void readSettings();
-    void writeSettings();
-    void readComboBoxSettings(const QString& key, QComboBox& box);
-    void writeComboBoxSettings(const QString& key, QComboBox& box);
+    void showOptions(const FifInput& input);
+    // Fills an editable box with a stored history, keeping what is typed.
+    static void showHistory(QComboBox& box, const QStringList& entries);
+    // Puts what is typed on top of the box's entries and gives them all.
+    static QStringList takeHistory(QComboBox& box);
 
     QPointer<FifJob> job;
     Settings* settings;

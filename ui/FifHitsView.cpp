@@ -58,12 +58,12 @@ FifHitsView::FifHitsView(FifJob* job, QWidget* parent)
                              tr("Clear All"), false);
     findInFilesAction = makeAction(this, "find-in-files", "gui-orba-find-in-files",
                                    tr("Find in files"), tr("Find Text in Files"), true);
-    showNextAction = makeAction(this, "show-next-fifhit", "gui-orba-show-next-fifhit",
+    nextCommand.own = makeAction(this, "show-next-fifhit", "gui-orba-show-next-fifhit",
                                 tr("Show Next Result"), tr("Show Next Result"), false);
-    showPreviousAction = makeAction(this, "show-previous-fifhit", "gui-orba-show-previous-fifhit",
+    previousCommand.own = makeAction(this, "show-previous-fifhit", "gui-orba-show-previous-fifhit",
                                     tr("Show Previous Result"), tr("Show Previous Result"),
                                     false);
-    stopAction = makeAction(this, "stop-fifjob", "gui-orba-stop-fifjob", tr("Stop"),
+    stopCommand.own = makeAction(this, "stop-fifjob", "gui-orba-stop-fifjob", tr("Stop"),
                             tr("Stop Job"), false);
     showCurrentAction = makeAction(this, "show-current-fifhit", "gui-orba-show-current-fifhit",
                                    tr("Goto"), tr("Show Current Result"), false);
@@ -80,11 +80,11 @@ FifHitsView::FifHitsView(FifJob* job, QWidget* parent)
     toolBar->setObjectName(QStringLiteral("toolBar"));
     toolBar->addAction(clearAction);
     toolBar->addAction(findInFilesAction);
-    toolBar->addAction(showNextAction);
-    toolBar->addAction(showPreviousAction);
+    toolBar->addAction(nextCommand.own);
+    toolBar->addAction(previousCommand.own);
     toolBar->addAction(showCurrentAction);
     toolBar->addAction(saveAction);
-    toolBar->addAction(stopAction);
+    toolBar->addAction(stopCommand.own);
     if (MainWindow* window = MainWindow::getInstance())
         toolBar->setIconSize(window->iconSize());
 
@@ -113,8 +113,8 @@ FifHitsView::FifHitsView(FifJob* job, QWidget* parent)
     vboxLayout->addWidget(treeView);
 
     connect(saveAction, &QAction::triggered, this, &FifHitsView::saveAs);
-    connect(showNextAction, &QAction::triggered, this, &FifHitsView::next);
-    connect(showPreviousAction, &QAction::triggered, this, &FifHitsView::previous);
+    connect(nextCommand.own, &QAction::triggered, this, &FifHitsView::next);
+    connect(previousCommand.own, &QAction::triggered, this, &FifHitsView::previous);
     connect(showCurrentAction, &QAction::triggered, this, &FifHitsView::showCurrentIndex);
     connect(treeView, &QAbstractItemView::doubleClicked, this, &FifHitsView::showIndex);
 
@@ -127,9 +127,9 @@ FifHitsView::FifHitsView(FifJob* job, QWidget* parent)
 
 FifHitsView::~FifHitsView()
 {
-    linkedNextAction = nullptr;
-    linkedPreviousAction = nullptr;
-    linkedStopAction = nullptr;
+    nextCommand.linked = nullptr;
+    previousCommand.linked = nullptr;
+    stopCommand.linked = nullptr;
 }
 
 void FifHitsView::setJob(FifJob* newJob)
@@ -143,7 +143,7 @@ void FifHitsView::setJob(FifJob* newJob)
         followRows(false);
         leaveSearching();
         disconnect(job, nullptr, this, nullptr);
-        disconnect(stopAction, &QAction::triggered, job, &FifJob::stop);
+        disconnect(stopCommand.own, &QAction::triggered, job, &FifJob::stop);
     }
 
     if (newJob) {
@@ -157,7 +157,7 @@ void FifHitsView::setJob(FifJob* newJob)
             if (newJob == job)
                 onEnded();
         });
-        connect(stopAction, &QAction::triggered, newJob, &FifJob::stop);
+        connect(stopCommand.own, &QAction::triggered, newJob, &FifJob::stop);
         // The view does not own its job; one deleted under it must not be
         // reached through a stale pointer.
         connect(newJob, &QObject::destroyed, this, [this, newJob] {
@@ -199,27 +199,27 @@ QLabel* FifHitsView::getStatusLabel() const
 
 void FifHitsView::linkNextAction(QAction* action)
 {
-    link(linkedNextAction, action, showNextAction);
+    nextCommand.link(action);
 }
 
 void FifHitsView::linkPreviousAction(QAction* action)
 {
-    link(linkedPreviousAction, action, showPreviousAction);
+    previousCommand.link(action);
 }
 
 void FifHitsView::linkStopAction(QAction* action)
 {
-    link(linkedStopAction, action, stopAction);
+    stopCommand.link(action);
 }
 
 void FifHitsView::unlinkActions()
 {
-    link(linkedNextAction, nullptr, showNextAction);
-    link(linkedPreviousAction, nullptr, showPreviousAction);
-    link(linkedStopAction, nullptr, stopAction);
+    nextCommand.link(nullptr);
+    previousCommand.link(nullptr);
+    stopCommand.link(nullptr);
 }
 
-void FifHitsView::link(QPointer<QAction>& linked, QAction* action, QAction* own)
+void FifHitsView::SharedCommand::link(QAction* action)
 {
     if (linked.data() == action)
         return;
@@ -230,6 +230,13 @@ void FifHitsView::link(QPointer<QAction>& linked, QAction* action, QAction* own)
     // view's own one, whatever the latter's enabled state.
     if (action)
         connect(action, &QAction::triggered, own, &QAction::triggered);
+}
+
+void FifHitsView::SharedCommand::setEnabled(bool enabled)
+{
+    own->setEnabled(enabled);
+    if (linked)
+        linked->setEnabled(enabled);
 }
 
 void FifHitsView::next()
@@ -277,7 +284,7 @@ void FifHitsView::onAboutToStart()
     chaseWidget->setAnimated(true);
     chaseWidgetAction->setVisible(true);
     statusLabel->clear();
-    setLinkedEnabled(stopAction, linkedStopAction, true);
+    stopCommand.setEnabled(true);
     followRows(true);
     show();
     if (auto* dock = qobject_cast<QDockWidget*>(parentWidget())) {
@@ -294,7 +301,7 @@ void FifHitsView::onEnded()
     statusLabel->setText(job->getResultText());
     chaseWidget->setAnimated(false);
     chaseWidgetAction->setVisible(false);
-    setLinkedEnabled(stopAction, linkedStopAction, false);
+    stopCommand.setEnabled(false);
     updateActions();
     followRows(false);
 }
@@ -313,13 +320,13 @@ void FifHitsView::updateActions()
     if (FifHitsModel* model = job->getHitsModel()) {
         // A view hidden behind another dock must not take the shared commands.
         const bool enabled = model->rowCount(QModelIndex()) > 0 && isVisible();
-        setLinkedEnabled(showNextAction, linkedNextAction, enabled);
-        setLinkedEnabled(showPreviousAction, linkedPreviousAction, enabled);
+        nextCommand.setEnabled(enabled);
+        previousCommand.setEnabled(enabled);
         showCurrentAction->setEnabled(enabled);
         saveAction->setEnabled(enabled);
         clearAction->setEnabled(enabled);
     }
-    setLinkedEnabled(stopAction, linkedStopAction, job->isRunning());
+    stopCommand.setEnabled(job->isRunning());
 }
 
 void FifHitsView::showCurrentIndex()
@@ -374,10 +381,10 @@ void FifHitsView::contextMenuEvent(QContextMenuEvent* event)
     QMenu menu(this);
     menu.addAction(showCurrentAction);
     menu.setDefaultAction(showCurrentAction);
-    menu.addAction(showNextAction);
-    menu.addAction(showPreviousAction);
+    menu.addAction(nextCommand.own);
+    menu.addAction(previousCommand.own);
     menu.addSeparator();
-    menu.addAction(stopAction);
+    menu.addAction(stopCommand.own);
     menu.addAction(saveAction);
     menu.addAction(findInFilesAction);
     menu.addAction(clearAction);
@@ -452,14 +459,7 @@ void FifHitsView::leaveSearching()
         return;
     chaseWidget->setAnimated(false);
     chaseWidgetAction->setVisible(false);
-    setLinkedEnabled(stopAction, linkedStopAction, false);
-}
-
-void FifHitsView::setLinkedEnabled(QAction* own, QAction* linked, bool enabled)
-{
-    own->setEnabled(enabled);
-    if (linked)
-        linked->setEnabled(enabled);
+    stopCommand.setEnabled(false);
 }
 
 void FifHitsView::followRows(bool follow)

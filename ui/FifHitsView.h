@@ -73,8 +73,6 @@ private:
     // Asks whether to wrap around; false when the user declines.
     bool confirmWrap(const QString& title, const QString& text);
     void selectAndShow(const QModelIndex& index);
-    void setLinkedEnabled(QAction* own, QAction* linked, bool enabled);
-    void link(QPointer<QAction>& linked, QAction* action, QAction* own);
     void followRows(bool follow);
     // Stills the busy indicator and disables the stop commands of a search
     // that is no longer followed.
@@ -87,16 +85,25 @@ private:
     QTreeView* treeView = nullptr;
     QAction* findInFilesAction = nullptr;
     QAction* showCurrentAction = nullptr;
-    QAction* showNextAction = nullptr;
-    QAction* showPreviousAction = nullptr;
-    QAction* stopAction = nullptr;
     QAction* clearAction = nullptr;
     QAction* saveAction = nullptr;
     ChaseWidget* chaseWidget = nullptr;
     QAction* chaseWidgetAction = nullptr;
-    QPointer<QAction> linkedNextAction;
-    QPointer<QAction> linkedPreviousAction;
-    QPointer<QAction> linkedStopAction;
+
+    // A command of the view and the host's shared action lent to it:
+    // triggering the shared one triggers the view's own, and the two are
+    // enabled alike.
+    struct SharedCommand
+    {
+        void link(QAction* action);
+        void setEnabled(bool enabled);
+
+        QAction* own = nullptr;
+        QPointer<QAction> linked;
+    };
+    SharedCommand nextCommand;
+    SharedCommand previousCommand;
+    SharedCommand stopCommand;
 };
 
 } // namespace Orba
