@@ -13,6 +13,8 @@ FifHit::FifHit()
     : line(-1)
     , offset(-1)
     , rawOffset(-1)
+    , column(-1)
+    , length(0)
 {
 }
 
@@ -24,6 +26,8 @@ FifHit::FifHit(const QString& fileName, int lineNumber, const QString& lineText,
     , offset(off)
     , rawOffset(rawOff)
     , text(lineText)
+    , column(-1)
+    , length(0)
 {
 }
 

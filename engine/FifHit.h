@@ -40,6 +40,8 @@ public:
     int offset;     // characters before the match, each line break counted as one
     int rawOffset;  // the same with line breaks counted as stored
     QString text;   // the line without its terminator
+    int column;     // where the first match starts in `text`; -1 when not known
+    int length;     // the characters the first match spans
 };
 
 typedef QList<FifHit> FifHitList;

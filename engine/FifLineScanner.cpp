@@ -158,10 +158,13 @@ FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint6
     }
 }
 
-int FifLineScanner::indexIn(const QString& text)
+int FifLineScanner::indexIn(const QString& text, int* length)
 {
-    if (text.size() <= sliceThreshold || anchored.pattern().isEmpty())
-        return rx.indexIn(text, 0, QRegExp::CaretAtZero);
+    if (text.size() <= sliceThreshold || anchored.pattern().isEmpty()) {
+        const int position = rx.indexIn(text, 0, QRegExp::CaretAtZero);
+        *length = rx.matchedLength();
+        return position;
+    }
     // With the caret at the offset, "^(?:P)" can only match at the offset,
     // and does so exactly when P matches there: P holds no caret, and every
     // other assertion sees the whole line as before.
@@ -170,8 +173,10 @@ int FifLineScanner::indexIn(const QString& text)
             stopped = true;
             return -1;
         }
-        if (anchored.indexIn(text, start, QRegExp::CaretAtOffset) == start)
+        if (anchored.indexIn(text, start, QRegExp::CaretAtOffset) == start) {
+            *length = anchored.matchedLength();
             return start;
+        }
     }
     return -1;
 }
@@ -219,11 +224,12 @@ bool FifLineScanner::readBlocks(QIODevice& device, Take take)
 
 void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars)
 {
-    const int position = indexIn(text);
+    int length = 0;
+    const int position = indexIn(text, &length);
     if (position >= 0) {
         hasHit = true;
         (*sink)(Match{clampToInt(lineNumber), clampToInt(offset + position),
-                      clampToInt(rawOffset + position), text});
+                      clampToInt(rawOffset + position), text, position, length});
     }
     advance(text.size() + extraChars, terminatorLength);
 }

@@ -31,6 +31,8 @@ public:
         int offset;     // characters before the match, line breaks counted as one
         int rawOffset;  // the same, line breaks counted as stored
         QString text;   // the line without its terminator
+        int column;     // where the match starts in `text`
+        int length;     // the characters it spans
     };
 
     // Called for every matching line.
@@ -79,8 +81,9 @@ private:
     void matchLine(const QString& text, int terminatorLength, qint64 extraChars);
     void advance(qint64 chars, int terminatorLength);
     // The first match in `text`, as rx.indexIn() with QRegExp::CaretAtZero
-    // finds it; sets `stopped` when a stop request ends the search first.
-    int indexIn(const QString& text);
+    // finds it, and its length; sets `stopped` when a stop request ends the
+    // search first.
+    int indexIn(const QString& text, int* length);
     bool stopRequested() const { return *stopPoll && (*stopPoll)(); }
 
     QRegExp rx;

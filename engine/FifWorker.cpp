@@ -182,8 +182,10 @@ void FifWorker::searchFile(const QString& path)
     const bool hasHit = scanner->scan(
         *file,
         [&](const FifLineScanner::Match& match) {
-            sendHit(FifHit(path, match.line, match.text, match.offset, match.rawOffset, job),
-                    batch);
+            FifHit hit(path, match.line, match.text, match.offset, match.rawOffset, job);
+            hit.column = match.column;
+            hit.length = match.length;
+            sendHit(hit, batch);
         },
         [this] { return job && job->shouldStop(); });
 
