@@ -1,5 +1,4 @@
 // FifInput::getRegExp, isValid and toString on arbitrary requests.
-//
 // Input: byte 0 the match type, byte 1 the flags, then UTF-8 text cut at zero bytes into `what`,
 // `where`, `filter` and a sample line. Matching is only tried on short texts: Qt's backtracking
 // engine is exponential on some patterns by nature, which is not what this target looks for.
@@ -25,12 +24,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
 {
     if (size < 2)
         return 0;
-    auto readInt = [&](size_t at) {
-        int value = 0;
-        if (at + sizeof value <= size)
-            std::memcpy(&value, data + at, sizeof value);
-        return value;
-    };
+    auto readInt = [&](size_t at) { int value = 0; std::memcpy(&value, data + at, at + 4 <= size ? 4 : 0); return value; };
     FifInput input;
     // Mostly the dialog's three syntaxes; also every QRegExp syntax and stored values out of range.
     const int types[] = {QRegExp::FixedString, QRegExp::Wildcard, QRegExp::RegExp2, data[0] / 5 % 8, readInt(2)};

@@ -1,6 +1,5 @@
 // The text test and the line scanner on arbitrary file contents, checked against FifReference's
 // plain reading of the same bytes.
-//
 // Input: byte 0 picks the expression, byte 1 when the scan is stopped; the rest is the file.
 
 #include "FifLineScanner.h"
@@ -11,7 +10,6 @@
 #include <QFile>
 #include <QFileInfo>
 
-#include <climits>
 #include <cstdio>
 #include <cstdlib>
 #include <unistd.h>
@@ -66,10 +64,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
 
     const QList<FifReference::Match> want = FifReference::matches(bytes, rx);
     qsizetype hitsAtStop;
-    check(scan(bytes, rx, INT_MAX, hitsAtStop) == want, "full scan", bytes);
+    check(scan(bytes, rx, 1 << 30, hitsAtStop) == want, "full scan", bytes);
     // Stopped at a poll: the first of the full hits, none after a poll said stop, all if none did.
     const QList<FifReference::Match> stopped = scan(bytes, rx, data[1] % 4 + 1, hitsAtStop);
-    check(stopped == want.mid(0, stopped.size()), "stopped scan", bytes);
-    check(stopped.size() == (hitsAtStop < 0 ? want.size() : hitsAtStop), "hit after the stop", bytes);
+    check(stopped == want.mid(0, hitsAtStop < 0 ? want.size() : hitsAtStop), "stopped scan", bytes);
     return 0;
 }
