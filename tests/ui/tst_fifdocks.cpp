@@ -33,8 +33,7 @@ private slots:
         handler.updateActions();
         QVERIFY(find.isEnabled() && usable(false, false));
 
-        FifManager* manager = FifManager::getInstance(&window);
-        QTemporaryDir dir;
+        QTemporaryDir dir; FifManager* manager = FifManager::getInstance(&window);
         QVERIFY(FifTest::write(dir.path(), "a.txt", "needle 1\nneedle 2\nneedle 3\n"));
         FifJob* other = manager->getJob(1);
         view(second)->setJob(other); FifTest::watch(other->getHitsModel()); window.show();
@@ -61,7 +60,8 @@ private slots:
         store->setValue(FifSettings().getFindWhatKeyPath(), QStringList{"stored"});
         store->setValue(FifSettings().getFilterKeyPath(), QString("*.txt"));
         QString asked;
-        connect(&handler, &FifHandler::getInput, this, [&](FifInput& in) { asked = in.what; in.what = "needle"; });
+        connect(&handler, &FifHandler::getInput, this,
+                [&](FifInput& input) { asked = input.what; input.what = "needle"; });
         QStringList seen;
         const auto answered = FifTest::answer<FifDialog>([&](FifDialog* dialog) {
             QVERIFY(dialog->parentWidget() == &window && dialog->getJob() == manager->getJob(0));

@@ -21,12 +21,12 @@ struct Fixture
     QTreeView* tree() const { return view->findChild<QTreeView*>(); }
     QModelIndex index(int row) const { return tree()->model()->index(row, 0); }
     QString label() const { return view->getStatusLabel()->text(); }
-    bool busy() const { return view->getToolBar()->actions().constLast()->isVisible(); } // the indicator's
+    bool busy() const { return view->getToolBar()->actions().constLast()->isVisible(); } // the indicator
     bool listCommands(bool on) const // next, previous, goto, save and clear
     {
         const char* names[] = {"show-next-fifhit", "show-previous-fifhit", "show-current-fifhit",
                                "save-fifhits", "clear-fifresults"};
-        return std::all_of(names, names + 5, [&](const char* name) { return action(name)->isEnabled() == on; });
+        return std::all_of(names, names + 5, [&](auto name) { return action(name)->isEnabled() == on; });
     }
 
     QTemporaryDir dir;
@@ -77,20 +77,20 @@ private slots:
         QVERIFY(!f.busy() && !stop.isEnabled() && !f.action("stop-fifjob")->isEnabled());
         QVERIFY(f.listCommands(true) && next.isEnabled() && previous.isEnabled());
 
-        // Replaced mid-search, a job no longer reaches the view, nor its stop
-        // the job; deleted mid-search, it leaves the view idle, without a job.
+        // Replaced mid-search, a job no longer reaches the view, nor its stop the job, and leaves
+        // no selection model behind; deleted mid-search, it leaves the view idle, without a job.
         disconnect(f.job, nullptr, &probe, nullptr);
         FifJob* other = f.manager.getJob(1);
+        FifTest::watch(other->getHitsModel());
         FifTest::EndWatcher firstEnd(f.job);
         QVERIFY(f.job->start(f.request) && f.busy() && stop.isEnabled());
         f.view->setJob(other);
         QVERIFY(!f.busy() && !stop.isEnabled() && f.tree()->model() == other->getHitsModel());
-        QCOMPARE(f.tree()->findChildren<QItemSelectionModel*>(Qt::FindDirectChildrenOnly).size(), 1); // no leak
+        QCOMPARE(f.tree()->findChildren<QItemSelectionModel*>(Qt::FindDirectChildrenOnly).size(), 1);
         QVERIFY(firstEnd.wait() && !f.label().startsWith("Found"));
         stop.setEnabled(true); stop.trigger();
         QVERIFY(other->shouldStop() && !f.job->shouldStop());
-        other->setShouldStop(false);
-        holdUntilStopped(other);
+        other->setShouldStop(false); holdUntilStopped(other);
         QVERIFY(other->start(f.request));
         // The busy indicator turns while a search runs and stands still after.
         auto* chase = f.view->findChild<ChaseWidget*>();
