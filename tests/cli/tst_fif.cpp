@@ -1,262 +1,170 @@
-#include "FifHitsModel.h"
-#include "FifInput.h"
-#include "FifJob.h"
-#include "FifManager.h"
-#include "TestTree.h"
+// fif run as a program: its hits against grep's on real trees, its options,
+// exit codes and messages, and what it does when its output is closed.
 
+#include "FifReference.h"
+#include "FifTest.h"
 #include <QProcess>
 #include <QRegularExpression>
-#include <QtTest>
 
-using namespace Gui::Orba;
+struct Run { int code = -1; QString out, err; };
 
-namespace {
-
-struct Result
+static Run run(const QStringList& command, const QString& folder = {})
 {
-    int exitCode = -1;
-    QByteArray out;
-    QByteArray err;
-};
-
-} // namespace
+    QProcess process;
+    process.setWorkingDirectory(folder);
+    if (command.first() == "grep") // bytes, not characters: -i folds ASCII letters only
+        process.setEnvironment(QProcess::systemEnvironment() << "LC_ALL=C");
+    process.start(command.first(), command.mid(1));
+    if (!process.waitForFinished(120000))
+        return process.kill(), process.waitForFinished(), Run();
+    return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -2,
+            process.readAllStandardOutput(), process.readAllStandardError()};
+}
 
 class tst_Fif : public QObject
 {
     Q_OBJECT
-
-private:
-    QString program;
+    const QString fif = qEnvironmentVariable("FIF_EXECUTABLE");
     QTemporaryDir tree;
-    QString root;
-
-    Result fif(const QStringList& arguments, const QString& workingDirectory = QString())
-    {
-        QProcess process;
-        process.setProgram(program);
-        process.setArguments(arguments);
-        process.setWorkingDirectory(workingDirectory.isEmpty() ? root : workingDirectory);
-        process.start();
-        Result result;
-        if (!process.waitForFinished(60000)) {
-            process.kill();
-            process.waitForFinished();
-            return result;
-        }
-        result.out = process.readAllStandardOutput();
-        result.err = process.readAllStandardError();
-        result.exitCode = process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -2;
-        return result;
-    }
-
-    // The lines that the engine, run in this process, gives for `request`.
-    QByteArray engineLines(const FifInput& request)
-    {
-        FifManager manager;
-        FifJob* job = manager.getJob(0);
-        QByteArray lines;
-        // Relative folders are taken from the current directory, as fif
-        // takes them from its own.
-        const QString current = QDir::currentPath();
-        QDir::setCurrent(root);
-        [&] { FIF_RUN_JOB(job, request, 60000); }();
-        QDir::setCurrent(current);
-        FifHitsModel* model = job->getHitsModel();
-        for (int row = 0; row < model->rowCount(); ++row)
-            lines += model->index(row, 0).data().toString().toUtf8() + '\n';
-        return lines;
-    }
 
 private slots:
-    void initTestCase()
-    {
-        program = qEnvironmentVariable("FIF_EXECUTABLE");
-        QVERIFY2(QFileInfo(program).isExecutable(), "FIF_EXECUTABLE names no program");
-        QVERIFY(tree.isValid());
-        root = tree.path();
-        QVERIFY(TestTree::write(root, "src/a.cpp", "int needle;\nNEEDLE\nneedles\n"));
-        QVERIFY(TestTree::write(root, "src/b.h", "// needle\n"));
-        QVERIFY(TestTree::write(root, "src/sub/c.cpp", "x needle y\n"));
-        QVERIFY(TestTree::write(root, "src/notes.txt", "needle\n"));
-        QVERIFY(TestTree::write(root, "docs/d.txt", "caf\xC3\xA9 needle\n"));
-        QVERIFY(TestTree::write(root, "-dir/e.txt", "a -x- b\n"));
-        QVERIFY(TestTree::write(root, "bin/data.bin", QByteArray("needle\0", 7)));
+    void initTestCase() {
+        QVERIFY2(QFileInfo(fif).isExecutable(), "FIF_EXECUTABLE names no program");
+        for (const auto& [path, bytes] : QList<std::pair<QString, QByteArray>>{
+                 {"src/a.cpp", "int needle;\nNEEDLE\nneedles\n"}, {"src/b.h", "// needle\n"},
+                 {"src/sub/c.cpp", "x needle y\n"}, {"src/notes.txt", "needle\n"},
+                 {"-dir/e.txt", "a -x- b\n"}, {"bin/data.bin", QByteArray("needle\0", 7)},
+                 {"control.h", "\x01 not text\nQString s;\n"}, {"text.h", "QString t;\r\n"}})
+            QVERIFY(FifTest::write(tree.path(), path, bytes));
+        QVERIFY(QFile::link(tree.filePath("text.h"), tree.filePath("link.h")));
     }
 
-    // Hits come in model order, as the results view would list them, and
-    // the counts follow on standard error.
-    void printsTheModelRows()
-    {
-        const Result r = fif({"needle", "src", "docs"});
-        QCOMPARE(r.exitCode, 0);
-        FifInput request;
-        request.what = "needle";
-        request.where = "src;docs";
-        QCOMPARE(r.out, engineLines(request));
-        QCOMPARE(r.out.count('\n'), 7);
-        QVERIFY(r.out.contains("src/a.cpp (1): int needle;\n"));
-        QVERIFY(r.out.contains("docs/d.txt (1): caf\xC3\xA9 needle\n"));
-        QCOMPARE(r.err, QByteArray("Found 7 line(s) in 5 file(s) out of 5 file(s)\n"));
+    // The same lines as grep's on system headers and our tree, but for files
+    // that fail fif's text test, which grep -a reads; links are passed over.
+    void sameHitsAsGrep_data() {
+        QTest::addColumn<QString>("fifOptions");
+        QTest::addColumn<QString>("grepOptions");
+        QTest::addColumn<QString>("pattern");
+        QTest::newRow("literal") << "--match-case" << "-F" << "QString";
+        QTest::newRow("case ignored") << "" << "-Fi" << "operator()(";
+        QTest::newRow("word") << "--match-case --word" << "-Fw" << "int";
+        QTest::newRow("regexp") << "--match-case --regexp" << "-E" << "^#include <Q|Q_[A-Z]+_EXPORT|\\)$";
+        QTest::newRow("regexp, case ignored") << "--regexp" << "-Ei" << "copyright.*[0-9]{4}";
+        QTest::newRow("wildcard") << "--match-case --wildcard" << "-E" << "Q_DECL_*EXPORT";
+    }
+    void sameHitsAsGrep() {
+        QFETCH(QString, fifOptions);
+        QFETCH(QString, grepOptions);
+        QFETCH(QString, pattern);
+        QStringList folders{tree.path()};
+        for (const char* folder : {"/usr/include/x86_64-linux-gnu/qt6/QtCore",
+                                   "/usr/include/x86_64-linux-gnu/bits", "/usr/include/ncursesw"})
+            if (QFileInfo(folder).isDir())
+                folders << folder;
+        const Run fifRun = run(QStringList{fif} + fifOptions.split(' ', Qt::SkipEmptyParts)
+                               + QStringList{"--", pattern} + folders);
+        const Run grepRun = run(QStringList{"grep", "-rnaZ", grepOptions, "-e",
+                                            QString(pattern).replace("*", ".*")} + folders);
+        QVERIFY(fifRun.code == 0 && grepRun.code == 0);
+        QStringList fifLines = fifRun.out.split('\n', Qt::SkipEmptyParts), grepLines, notText;
+        QString file;
+        for (const QString& line : grepRun.out.split('\n', Qt::SkipEmptyParts)) {
+            const qsizetype zero = line.indexOf(QChar(0)), colon = line.indexOf(':', zero + 1);
+            if (line.left(zero) != file) { // grep lists the lines of a file together
+                QFile opened(file = line.left(zero));
+                if (!opened.open(QIODevice::ReadOnly) || !FifReference::isText(opened.readAll()))
+                    notText << file;
+            }
+            if (!notText.contains(file)) // as fif prints it, without grep's "\r" of a "\r\n"
+                grepLines << QString("%1 (%2): %3").arg(file, line.mid(zero + 1, colon - zero - 1),
+                                                        line.mid(colon + 1).remove(QRegularExpression("\r$")));
+        }
+        QVERIFY(pattern != "QString" || notText.contains(tree.filePath("control.h")));
+        QVERIFY(!fifLines.isEmpty());
+        fifLines.sort();
+        grepLines.sort();
+        QCOMPARE(fifLines, grepLines);
     }
 
-    void defaultFolderIsTheCurrentOne()
-    {
-        const Result r = fif({"--match-case", "x needle"}, root + "/src");
-        QCOMPARE(r.exitCode, 0);
-        QCOMPARE(r.out, QByteArray("./sub/c.cpp (1): x needle y\n"));
-        QCOMPARE(r.err, QByteArray("Found 1 line(s) in 1 file(s) out of 4 file(s)\n"));
-    }
-
-    void options_data()
-    {
+    // Hits as "file (line): text" by the folders as named and the counts on
+    // standard error; else an exit code and a message.
+    void runs_data() {
         QTest::addColumn<QStringList>("arguments");
         QTest::addColumn<QStringList>("lines");
-        QTest::newRow("match case") << QStringList{"--match-case", "NEEDLE", "src"}
-                                    << QStringList{"src/a.cpp (2): NEEDLE"};
-        QTest::newRow("word") << QStringList{"--word", "--filter", "*.cpp", "needle", "src"}
-                              << QStringList{"src/a.cpp (1): int needle;",
-                                             "src/a.cpp (2): NEEDLE",
-                                             "src/sub/c.cpp (1): x needle y"};
-        QTest::newRow("wildcard") << QStringList{"--wildcard", "x*y", "src"}
-                                  << QStringList{"src/sub/c.cpp (1): x needle y"};
-        QTest::newRow("regexp") << QStringList{"--regexp", "^need.*s$", "src"}
-                                << QStringList{"src/a.cpp (3): needles"};
-        QTest::newRow("literal dot and star") << QStringList{"e.*s", "src"} << QStringList{};
-        QTest::newRow("no subfolders")
-            << QStringList{"--no-subfolders", "--match-case", "--filter", "*.cpp", "needle",
-                           "src"}
-            << QStringList{"src/a.cpp (1): int needle;", "src/a.cpp (3): needles"};
-        QTest::newRow("two filters") << QStringList{"--filter=*.H;*.txt", "// needle", "src"}
-                                     << QStringList{"src/b.h (1): // needle"};
-        QTest::newRow("blank before filter")
-            << QStringList{"--filter", "*.cpp; *.h", "// needle", "src"} << QStringList{};
-        QTest::newRow("dashes after --")
-            << QStringList{"--", "-x-", "-dir"} << QStringList{"-dir/e.txt (1): a -x- b"};
-        QTest::newRow("binary skipped") << QStringList{"needle", "bin"} << QStringList{};
+        QTest::addColumn<int>("code");
+        QTest::addColumn<QString>("err"); // empty: the counts of `lines`
+        const auto row = [](const char* name, const QStringList& arguments,
+                            const QStringList& lines, int code = 1, const QString& err = {}) {
+            QTest::newRow(name) << arguments << lines << (lines.isEmpty() ? code : 0) << err;
+        };
+        const QString c = "x needle y", more = "\nTry 'fif --help' for more information.\n";
+        row("match case", {"--match-case", "NEEDLE", "src"}, {"src/a.cpp (2): NEEDLE"});
+        row("word", {"--word", "--filter", "*.cpp", "needle", "src"},
+            {"src/a.cpp (1): int needle;", "src/a.cpp (2): NEEDLE", "src/sub/c.cpp (1): " + c});
+        row("literal", {"e.*s", "src"}, {});
+        row("no subfolders", {"--no-subfolders", "--match-case", "--filter", "*.cpp", "needle", "src"},
+            {"src/a.cpp (1): int needle;", "src/a.cpp (3): needles"});
+        row("filters", {"--filter=*.H;*.txt", "needle", "src"},
+            {"src/b.h (1): // needle", "src/notes.txt (1): needle"});
+        row("blank before a filter", {"--filter", "*.cpp; *.h", "// needle", "src"}, {});
+        row("dashes after --", {"--", "-x-", "-dir"}, {"-dir/e.txt (1): a -x- b"});
+        row("folders, not text", {"--match-case", "needle", "bin", "src/sub"}, {"src/sub/c.cpp (1): " + c});
+        row("current folder", {"--match-case", c}, {"./src/sub/c.cpp (1): " + c});
+        row("none", {"nothing", "src"}, {}, 1, "Found 0 line(s) in 0 file(s) out of 4 file(s)\n");
+        row("empty", {"", "src"}, {}, 2, "Empty Expression: Please enter the search expression "
+                                         "in the \"Find what:\" field.\n");
+        row("bad regexp", {"--regexp", "a(", "src"}, {}, 2,
+            "Bad Expression: " + QRegExp("a(").errorString() + ": \"a(\"\n");
+        row("no pattern", {}, {}, 2, "fif: Missing PATTERN." + more);
+        row("two syntaxes", {"--wildcard", "--regexp", "x"}, {}, 2,
+            "fif: --wildcard and --regexp exclude each other." + more);
+        row("unknown option", {"--frob", "x"}, {}, 2, "fif: Unknown option 'frob'." + more);
     }
-
-    void options()
-    {
+    void runs() {
         QFETCH(QStringList, arguments);
         QFETCH(QStringList, lines);
-        const Result r = fif(arguments);
-        QStringList out = QString::fromUtf8(r.out).split('\n', Qt::SkipEmptyParts);
+        QFETCH(int, code);
+        QFETCH(QString, err);
+        const Run r = run(QStringList{fif} + arguments, tree.path());
+        QStringList out = r.out.split('\n', Qt::SkipEmptyParts), files;
         out.sort();
         QCOMPARE(out, lines);
-        QCOMPARE(r.exitCode, lines.isEmpty() ? 1 : 0);
-        QVERIFY(r.err.startsWith("Found "));
+        QCOMPARE(r.code, code);
+        for (const QString& line : lines)
+            files << line.left(line.indexOf(" ("));
+        files.removeDuplicates();
+        const QString counts = QString("Found %1 line(s) in %2 file(s) out of ")
+                                   .arg(lines.size()).arg(files.size());
+        if (err.isEmpty())
+            QVERIFY2(r.err.startsWith(counts) && r.err.endsWith(" file(s)\n"), qPrintable(r.err));
+        else
+            QCOMPARE(r.err, err);
     }
 
-    void exitCodes_data()
-    {
-        QTest::addColumn<QStringList>("arguments");
-        QTest::addColumn<int>("exitCode");
-        QTest::addColumn<QString>("err");
-        FifInput request;
-        request.what = "(";
-        request.matchType = QRegExp::RegExp2;
-        const QString nothing = "Found 0 line(s) in 0 file(s) out of 4 file(s)\n";
-        QTest::newRow("nothing found") << QStringList{"no such text", "src"} << 1 << nothing;
-        QTest::newRow("empty") << QStringList{"", "src"} << 2
-                               << "Empty Expression: Please enter the search expression in "
-                                  "the \"Find what:\" field.\n";
-        QTest::newRow("bad regexp") << QStringList{"--regexp", "(", "src"} << 2
-                                    << "Bad Expression: " + request.getRegExp().errorString()
-                                           + ": \"(\"\n";
-        QTest::newRow("same text, literal") << QStringList{"(", "src"} << 1 << nothing;
+    void helpAndVersion() {
+        const Run help = run({fif, "--help"}), version = run({fif, "--version"});
+        QVERIFY(help.code == 0 && help.out.contains("--no-subfolders") && help.out.contains("--word"));
+        QVERIFY(version.code == 0
+                && QRegularExpression("^fif \\d+\\.\\d+\\.\\d+\n$").match(version.out).hasMatch());
     }
 
-    void exitCodes()
-    {
-        QFETCH(QStringList, arguments);
-        QFETCH(int, exitCode);
-        QFETCH(QString, err);
-        const Result r = fif(arguments);
-        QCOMPARE(r.exitCode, exitCode);
-        QVERIFY(r.out.isEmpty());
-        QCOMPARE(QString::fromUtf8(r.err), err);
-    }
-
-    void badArguments_data()
-    {
-        QTest::addColumn<QStringList>("arguments");
-        QTest::newRow("no pattern") << QStringList{};
-        QTest::newRow("unknown option") << QStringList{"--frobnicate", "x"};
-        QTest::newRow("dash pattern without --") << QStringList{"-x-", "src"};
-        QTest::newRow("two syntaxes") << QStringList{"--wildcard", "--regexp", "x"};
-        QTest::newRow("filter without value") << QStringList{"x", "--filter"};
-    }
-
-    void badArguments()
-    {
-        QFETCH(QStringList, arguments);
-        const Result r = fif(arguments);
-        QCOMPARE(r.exitCode, 2);
-        QVERIFY(r.out.isEmpty());
-        QVERIFY(r.err.startsWith("fif: "));
-    }
-
-    void helpAndVersion()
-    {
-        Result r = fif({"--help"});
-        QCOMPARE(r.exitCode, 0);
-        for (const char* option : {"--filter", "--match-case", "--word", "--wildcard",
-                                   "--regexp", "--no-subfolders", "--version"})
-            QVERIFY2(r.out.contains(option), option);
-        r = fif({"--version"});
-        QCOMPARE(r.exitCode, 0);
-        QVERIFY(QRegularExpression("^fif \\d+\\.\\d+\\.\\d+\n$")
-                    .match(QString::fromUtf8(r.out))
-                    .hasMatch());
-    }
-
-    // A reader that leaves stops the search: fif ends normally, without an
-    // error message, having found fewer lines than the tree holds.
-    void closedPipe()
-    {
+    // A reader that leaves stops the search: fif ends normally, having found
+    // fewer lines than there are. Started without standard output, it writes
+    // into no descriptor that took its place.
+    void closedOutput() {
         QTemporaryDir big;
-        QByteArray bytes;
-        for (int i = 0; i < 1000; ++i)
-            bytes += "a line with a needle in it\n";
         for (int f = 0; f < 100; ++f)
-            QVERIFY(TestTree::write(big.path(), QString("f%1.txt").arg(f), bytes));
-        if (QStandardPaths::findExecutable("bash").isEmpty())
-            QSKIP("bash is needed for a real pipeline");
-        // fif's output goes to head, which leaves after the first line.
-        QProcess shell;
-        shell.start("bash", {"-c", "\"$0\" needle \"$1\" 2>\"$2\" | head -n 1; "
-                                   "echo \"${PIPESTATUS[0]}\" >\"$3\"",
-                             program, big.path(), big.path() + "/err", big.path() + "/code"});
-        QVERIFY(shell.waitForFinished(60000));
-        const QByteArray out = shell.readAllStandardOutput();
-        QVERIFY(out.startsWith(big.path().toUtf8() + "/f"));
-        QVERIFY(out.endsWith("needle in it\n"));
-        QCOMPARE(out.count('\n'), 1);
-        QFile code(big.path() + "/code");
-        QVERIFY(code.open(QIODevice::ReadOnly));
-        QCOMPARE(code.readAll(), QByteArray("0\n"));
-        QFile errors(big.path() + "/err");
-        QVERIFY(errors.open(QIODevice::ReadOnly));
-        const QString err = QString::fromUtf8(errors.readAll());
-        const QRegularExpressionMatch match =
-            QRegularExpression("^Found (\\d+) line\\(s\\) in \\d+ file\\(s\\) out of \\d+ "
-                               "file\\(s\\)\n$")
-                .match(err);
-        QVERIFY2(match.hasMatch(), qPrintable(err));
-        QVERIFY(match.captured(1).toInt() < 100 * 1000);
-    }
-
-    // Started with standard output closed, fif writes into no descriptor
-    // that happens to take its number, and says so.
-    void closedOutputAtStart()
-    {
-        if (QStandardPaths::findExecutable("bash").isEmpty())
-            QSKIP("bash is needed to close a descriptor");
-        QProcess shell;
-        shell.start("bash", {"-c", "\"$0\" needle \"$1\" >&-", program, root + "/src"});
-        QVERIFY(shell.waitForFinished(60000));
-        QCOMPARE(shell.exitCode(), 2);
-        QCOMPARE(shell.readAllStandardError(), QByteArray("fif: standard output is closed\n"));
+            QVERIFY(FifTest::write(big.path(), QString("f%1.txt").arg(f),
+                                   QByteArray("a line with a needle in it\n").repeated(1000)));
+        const Run piped = run({"bash", "-c", "\"$0\" needle \"$1\" 2>\"$1/err\" | head -n 1;"
+                                             "echo ${PIPESTATUS[0]}; cat \"$1/err\"", fif, big.path()});
+        const QStringList lines = piped.out.split('\n');
+        QVERIFY2(lines.size() == 4 && lines[0].endsWith("): a line with a needle in it")
+                     && lines[1] == "0", qPrintable(piped.out));
+        const auto found = QRegularExpression("^Found (\\d+) line\\(s\\) in ").match(lines[2]);
+        QVERIFY2(found.hasMatch() && found.captured(1).toInt() < 100 * 1000, qPrintable(lines[2]));
+        const Run closed = run({"bash", "-c", "\"$0\" needle \"$1\" >&-", fif, big.path()});
+        QVERIFY(closed.code == 2 && closed.err == "fif: standard output is closed\n");
     }
 };
 
