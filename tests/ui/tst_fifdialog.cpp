@@ -1,4 +1,15 @@
-#include "FifUiTest.h"
+#include "FifDialog.h"
+#include "FifHitsView.h"
+#include "FifManager.h"
+#include "FifSettings.h"
+#include "FifTest.h"
+
+#include <QtTest>
+#include <QtWidgets>
+
+using namespace Gui::Orba;
+using FifTest::holdUntilStopped;
+using FifTest::items;
 
 template <class T = QPushButton>
 T* part(const QWidget& dialog, const QString& name) { return dialog.findChild<T*>(name); }

@@ -1,7 +1,18 @@
+#include "FifDialog.h"
 #include "FifHandler.h"
+#include "FifHitsView.h"
+#include "FifManager.h"
 #include "FifResultsDockWidget.h"
-#include "FifUiTest.h"
+#include "FifSettings.h"
+#include "FifTest.h"
 #include "MainWindow.h"
+
+#include <QtTest>
+#include <QtWidgets>
+
+using namespace Gui::Orba;
+using FifTest::holdUntilStopped;
+using FifTest::items;
 
 FifHitsView* view(QDockWidget* dock) { return qobject_cast<FifHitsView*>(dock->widget()); }
 

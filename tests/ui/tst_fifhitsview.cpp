@@ -1,5 +1,16 @@
 #include "ChaseWidget.h"
-#include "FifUiTest.h"
+#include "FifDialog.h"
+#include "FifHitsView.h"
+#include "FifManager.h"
+#include "FifSettings.h"
+#include "FifTest.h"
+
+#include <QtTest>
+#include <QtWidgets>
+
+using namespace Gui::Orba;
+using FifTest::holdUntilStopped;
+using FifTest::items;
 
 // A results view in a shown dock, on job 0 of its own manager, over `files`
 // files with `hits` lines holding "needle" each and `plain` files without.
