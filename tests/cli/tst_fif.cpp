@@ -1,262 +1,127 @@
-#include "FifHitsModel.h"
-#include "FifInput.h"
-#include "FifJob.h"
-#include "FifManager.h"
-#include "TestTree.h"
+// fif as a program: its hits against grep's, its options, exit codes, messages, closed output.
 
+#include "FifReference.h"
+#include "FifTest.h"
 #include <QProcess>
 #include <QRegularExpression>
-#include <QtTest>
 
-using namespace Gui::Orba;
+struct Run { int code; QString out, err; };
 
-namespace {
-
-struct Result
+static Run run(const QStringList& command)
 {
-    int exitCode = -1;
-    QByteArray out;
-    QByteArray err;
-};
-
-} // namespace
+    QProcess process;
+    if (command.first() == "grep") // bytes, not characters: -i folds ASCII letters only
+        process.setEnvironment(QProcess::systemEnvironment() << "LC_ALL=C");
+    process.start(command.first(), command.mid(1));
+    const bool ok = process.waitForFinished(120000) && process.exitStatus() == QProcess::NormalExit;
+    return {ok ? process.exitCode() : -1, process.readAllStandardOutput(),
+            process.readAllStandardError()};
+}
 
 class tst_Fif : public QObject
 {
     Q_OBJECT
-
-private:
-    QString program;
+    const QString fif = qEnvironmentVariable("FIF_EXECUTABLE");
     QTemporaryDir tree;
-    QString root;
-
-    Result fif(const QStringList& arguments, const QString& workingDirectory = QString())
-    {
-        QProcess process;
-        process.setProgram(program);
-        process.setArguments(arguments);
-        process.setWorkingDirectory(workingDirectory.isEmpty() ? root : workingDirectory);
-        process.start();
-        Result result;
-        if (!process.waitForFinished(60000)) {
-            process.kill();
-            process.waitForFinished();
-            return result;
-        }
-        result.out = process.readAllStandardOutput();
-        result.err = process.readAllStandardError();
-        result.exitCode = process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -2;
-        return result;
-    }
-
-    // The lines that the engine, run in this process, gives for `request`.
-    QByteArray engineLines(const FifInput& request)
-    {
-        FifManager manager;
-        FifJob* job = manager.getJob(0);
-        QByteArray lines;
-        // Relative folders are taken from the current directory, as fif
-        // takes them from its own.
-        const QString current = QDir::currentPath();
-        QDir::setCurrent(root);
-        [&] { FIF_RUN_JOB(job, request, 60000); }();
-        QDir::setCurrent(current);
-        FifHitsModel* model = job->getHitsModel();
-        for (int row = 0; row < model->rowCount(); ++row)
-            lines += model->index(row, 0).data().toString().toUtf8() + '\n';
-        return lines;
-    }
-
 private slots:
-    void initTestCase()
-    {
-        program = qEnvironmentVariable("FIF_EXECUTABLE");
-        QVERIFY2(QFileInfo(program).isExecutable(), "FIF_EXECUTABLE names no program");
-        QVERIFY(tree.isValid());
-        root = tree.path();
-        QVERIFY(TestTree::write(root, "src/a.cpp", "int needle;\nNEEDLE\nneedles\n"));
-        QVERIFY(TestTree::write(root, "src/b.h", "// needle\n"));
-        QVERIFY(TestTree::write(root, "src/sub/c.cpp", "x needle y\n"));
-        QVERIFY(TestTree::write(root, "src/notes.txt", "needle\n"));
-        QVERIFY(TestTree::write(root, "docs/d.txt", "caf\xC3\xA9 needle\n"));
-        QVERIFY(TestTree::write(root, "-dir/e.txt", "a -x- b\n"));
-        QVERIFY(TestTree::write(root, "bin/data.bin", QByteArray("needle\0", 7)));
+    void initTestCase() {
+        QVERIFY2(QFileInfo(fif).isExecutable(), "FIF_EXECUTABLE names no program");
+        for (const auto& [path, bytes] : QList<std::pair<QString, QByteArray>>{
+                 {"src/a.cpp", "int needle;\nNEEDLE\nneedles\n"}, {"src/b.h", "// needle\n"},
+                 {"src/sub/c.cpp", "x needle y\n"}, {"src/notes.txt", "needle\n"},
+                 {"-dir/e.txt", "a -x- b\n"}, {"control.h", "\x01 not text\nQString s;\n"},
+                 {"text.h", "QString t;\r\n"}})
+            QVERIFY(FifTest::write(tree.path(), path, bytes));
+        QVERIFY(QFile::link("text.h", tree.filePath("link.h")) && QDir::setCurrent(tree.path()));
     }
-
-    // Hits come in model order, as the results view would list them, and
-    // the counts follow on standard error.
-    void printsTheModelRows()
-    {
-        const Result r = fif({"needle", "src", "docs"});
-        QCOMPARE(r.exitCode, 0);
-        FifInput request;
-        request.what = "needle";
-        request.where = "src;docs";
-        QCOMPARE(r.out, engineLines(request));
-        QCOMPARE(r.out.count('\n'), 7);
-        QVERIFY(r.out.contains("src/a.cpp (1): int needle;\n"));
-        QVERIFY(r.out.contains("docs/d.txt (1): caf\xC3\xA9 needle\n"));
-        QCOMPARE(r.err, QByteArray("Found 7 line(s) in 5 file(s) out of 5 file(s)\n"));
+    // The same lines as grep's on system headers and our tree, but for files
+    // that fail fif's text test, which grep -a reads; links are passed over.
+    void sameHitsAsGrep_data() {
+        QTest::addColumn<QString>("fifOptions");
+        QTest::addColumn<QString>("grepOptions");
+        QTest::addColumn<QString>("pattern");
+        QTest::newRow("literal") << "--match-case" << "-F" << "QString";
+        QTest::newRow("case ignored") << "" << "-Fi" << "operator()(";
+        QTest::newRow("word") << "--match-case --word" << "-Fw" << "int";
+        QTest::newRow("regexp") << "--regexp" << "-Ei" << "^#include <Q|Q_[A-Z]+_EXPORT|\\)$";
+        QTest::newRow("wildcard") << "--match-case --wildcard" << "-E" << "Q_DECL_*EXPORT";
     }
-
-    void defaultFolderIsTheCurrentOne()
-    {
-        const Result r = fif({"--match-case", "x needle"}, root + "/src");
-        QCOMPARE(r.exitCode, 0);
-        QCOMPARE(r.out, QByteArray("./sub/c.cpp (1): x needle y\n"));
-        QCOMPARE(r.err, QByteArray("Found 1 line(s) in 1 file(s) out of 4 file(s)\n"));
+    void sameHitsAsGrep() {
+        QFETCH(QString, fifOptions); QFETCH(QString, grepOptions); QFETCH(QString, pattern);
+        const QStringList folders{tree.path(), "/usr/include/x86_64-linux-gnu/qt6/QtCore",
+                                  "/usr/include/x86_64-linux-gnu/bits"};
+        const Run fifRun = run(QStringList{fif} + fifOptions.split(' ', Qt::SkipEmptyParts)
+                               + QStringList{"--", pattern} + folders);
+        const Run grepRun = run(QStringList{"grep", "-rnaZ", grepOptions, "-e",
+                                            QString(pattern).replace("*", ".*")} + folders);
+        QVERIFY(fifRun.code == 0 && grepRun.code == 0);
+        QStringList fifLines = fifRun.out.split('\n', Qt::SkipEmptyParts), grepLines, notText;
+        QString file;
+        for (const QString& line : grepRun.out.split('\n', Qt::SkipEmptyParts)) {
+            const qsizetype zero = line.indexOf(QChar(0)), colon = line.indexOf(':', zero + 1);
+            if (line.left(zero) != file) { // grep lists the lines of a file together
+                QFile opened(file = line.left(zero));
+                if (!opened.open(QIODevice::ReadOnly) || !FifReference::isText(opened.readAll()))
+                    notText << file;
+            }
+            const QString number = line.mid(zero + 1, colon - zero - 1), text = line.mid(colon + 1);
+            if (!notText.contains(file)) // without the "\r" of a "\r\n", as fif has it
+                grepLines << file + " (" + number + "): " + text.chopped(text.endsWith('\r'));
+        }
+        QVERIFY(pattern != "QString" || notText.contains(tree.filePath("control.h")));
+        fifLines.sort();
+        grepLines.sort();
+        QCOMPARE(fifLines, grepLines);
     }
-
-    void options_data()
-    {
-        QTest::addColumn<QStringList>("arguments");
-        QTest::addColumn<QStringList>("lines");
-        QTest::newRow("match case") << QStringList{"--match-case", "NEEDLE", "src"}
-                                    << QStringList{"src/a.cpp (2): NEEDLE"};
-        QTest::newRow("word") << QStringList{"--word", "--filter", "*.cpp", "needle", "src"}
-                              << QStringList{"src/a.cpp (1): int needle;",
-                                             "src/a.cpp (2): NEEDLE",
-                                             "src/sub/c.cpp (1): x needle y"};
-        QTest::newRow("wildcard") << QStringList{"--wildcard", "x*y", "src"}
-                                  << QStringList{"src/sub/c.cpp (1): x needle y"};
-        QTest::newRow("regexp") << QStringList{"--regexp", "^need.*s$", "src"}
-                                << QStringList{"src/a.cpp (3): needles"};
-        QTest::newRow("literal dot and star") << QStringList{"e.*s", "src"} << QStringList{};
-        QTest::newRow("no subfolders")
-            << QStringList{"--no-subfolders", "--match-case", "--filter", "*.cpp", "needle",
-                           "src"}
-            << QStringList{"src/a.cpp (1): int needle;", "src/a.cpp (3): needles"};
-        QTest::newRow("two filters") << QStringList{"--filter=*.H;*.txt", "// needle", "src"}
-                                     << QStringList{"src/b.h (1): // needle"};
-        QTest::newRow("blank before filter")
-            << QStringList{"--filter", "*.cpp; *.h", "// needle", "src"} << QStringList{};
-        QTest::newRow("dashes after --")
-            << QStringList{"--", "-x-", "-dir"} << QStringList{"-dir/e.txt (1): a -x- b"};
-        QTest::newRow("binary skipped") << QStringList{"needle", "bin"} << QStringList{};
+    // Hits as "file (line): text" by the folders as named and their count on
+    // standard error, exit code 0; none found, 1; else a message and 2.
+    void runs_data() {
+        QTest::addColumn<QString>("arguments"); // separated by "|"
+        QTest::addColumn<QString>("out");
+        QTest::addColumn<QString>("err"); // empty: the count of `out`
+        const auto row = [](const char* name, const char* args, const char* out,
+                            const QString& err = {}) { QTest::newRow(name) << args << out << err; };
+        row("no subfolders", "--no-subfolders|--match-case|--filter|*.cpp|needle|src",
+            "src/a.cpp (1): int needle;\nsrc/a.cpp (3): needles\n");
+        row("filters, word", "--word|--filter=*.H;*.txt|needle|src",
+            "src/b.h (1): // needle\nsrc/notes.txt (1): needle\n");
+        row("dashes after --", "--|-x-|-dir", "-dir/e.txt (1): a -x- b\n");
+        row("current folder", "--match-case|x needle", "./src/sub/c.cpp (1): x needle y\n");
+        row("none", "nothing|src", "", "Found 0 line(s) in 0 file(s) out of 4 file(s)\n");
+        row("empty", "|src", "",
+            "Empty Expression: Please enter the search expression in the \"Find what:\" field.\n");
+        row("bad regexp", "--regexp|a(|src", "",
+            "Bad Expression: " + QRegExp("a(").errorString() + ": \"a(\"\n");
+        row("no pattern", "--match-case", "",
+            "fif: Missing PATTERN.\nTry 'fif --help' for more information.\n");
     }
-
-    void options()
-    {
-        QFETCH(QStringList, arguments);
-        QFETCH(QStringList, lines);
-        const Result r = fif(arguments);
-        QStringList out = QString::fromUtf8(r.out).split('\n', Qt::SkipEmptyParts);
-        out.sort();
-        QCOMPARE(out, lines);
-        QCOMPARE(r.exitCode, lines.isEmpty() ? 1 : 0);
-        QVERIFY(r.err.startsWith("Found "));
+    void runs() {
+        QFETCH(QString, arguments); QFETCH(QString, out); QFETCH(QString, err);
+        const Run r = run(QStringList{fif} + arguments.split('|'));
+        QStringList lines = r.out.split('\n', Qt::SkipEmptyParts);
+        lines.sort();
+        QCOMPARE(lines.join('\n'), out.trimmed());
+        QVERIFY2(err.isEmpty() ? r.err.startsWith(QString("Found %1 line(s) in ").arg(lines.size()))
+                               : r.err == err, qPrintable(r.err));
+        QCOMPARE(r.code, !out.isEmpty() ? 0 : err.isEmpty() || err.startsWith("Found") ? 1 : 2);
     }
-
-    void exitCodes_data()
-    {
-        QTest::addColumn<QStringList>("arguments");
-        QTest::addColumn<int>("exitCode");
-        QTest::addColumn<QString>("err");
-        FifInput request;
-        request.what = "(";
-        request.matchType = QRegExp::RegExp2;
-        const QString nothing = "Found 0 line(s) in 0 file(s) out of 4 file(s)\n";
-        QTest::newRow("nothing found") << QStringList{"no such text", "src"} << 1 << nothing;
-        QTest::newRow("empty") << QStringList{"", "src"} << 2
-                               << "Empty Expression: Please enter the search expression in "
-                                  "the \"Find what:\" field.\n";
-        QTest::newRow("bad regexp") << QStringList{"--regexp", "(", "src"} << 2
-                                    << "Bad Expression: " + request.getRegExp().errorString()
-                                           + ": \"(\"\n";
-        QTest::newRow("same text, literal") << QStringList{"(", "src"} << 1 << nothing;
-    }
-
-    void exitCodes()
-    {
-        QFETCH(QStringList, arguments);
-        QFETCH(int, exitCode);
-        QFETCH(QString, err);
-        const Result r = fif(arguments);
-        QCOMPARE(r.exitCode, exitCode);
-        QVERIFY(r.out.isEmpty());
-        QCOMPARE(QString::fromUtf8(r.err), err);
-    }
-
-    void badArguments_data()
-    {
-        QTest::addColumn<QStringList>("arguments");
-        QTest::newRow("no pattern") << QStringList{};
-        QTest::newRow("unknown option") << QStringList{"--frobnicate", "x"};
-        QTest::newRow("dash pattern without --") << QStringList{"-x-", "src"};
-        QTest::newRow("two syntaxes") << QStringList{"--wildcard", "--regexp", "x"};
-        QTest::newRow("filter without value") << QStringList{"x", "--filter"};
-    }
-
-    void badArguments()
-    {
-        QFETCH(QStringList, arguments);
-        const Result r = fif(arguments);
-        QCOMPARE(r.exitCode, 2);
-        QVERIFY(r.out.isEmpty());
-        QVERIFY(r.err.startsWith("fif: "));
-    }
-
-    void helpAndVersion()
-    {
-        Result r = fif({"--help"});
-        QCOMPARE(r.exitCode, 0);
-        for (const char* option : {"--filter", "--match-case", "--word", "--wildcard",
-                                   "--regexp", "--no-subfolders", "--version"})
-            QVERIFY2(r.out.contains(option), option);
-        r = fif({"--version"});
-        QCOMPARE(r.exitCode, 0);
-        QVERIFY(QRegularExpression("^fif \\d+\\.\\d+\\.\\d+\n$")
-                    .match(QString::fromUtf8(r.out))
-                    .hasMatch());
-    }
-
-    // A reader that leaves stops the search: fif ends normally, without an
-    // error message, having found fewer lines than the tree holds.
-    void closedPipe()
-    {
+    // A reader that leaves stops the search: fif ends normally, having found
+    // fewer lines than there are. Started without standard output, it writes
+    // into no descriptor that took its place.
+    void closedOutput() {
         QTemporaryDir big;
-        QByteArray bytes;
-        for (int i = 0; i < 1000; ++i)
-            bytes += "a line with a needle in it\n";
         for (int f = 0; f < 100; ++f)
-            QVERIFY(TestTree::write(big.path(), QString("f%1.txt").arg(f), bytes));
-        if (QStandardPaths::findExecutable("bash").isEmpty())
-            QSKIP("bash is needed for a real pipeline");
-        // fif's output goes to head, which leaves after the first line.
-        QProcess shell;
-        shell.start("bash", {"-c", "\"$0\" needle \"$1\" 2>\"$2\" | head -n 1; "
-                                   "echo \"${PIPESTATUS[0]}\" >\"$3\"",
-                             program, big.path(), big.path() + "/err", big.path() + "/code"});
-        QVERIFY(shell.waitForFinished(60000));
-        const QByteArray out = shell.readAllStandardOutput();
-        QVERIFY(out.startsWith(big.path().toUtf8() + "/f"));
-        QVERIFY(out.endsWith("needle in it\n"));
-        QCOMPARE(out.count('\n'), 1);
-        QFile code(big.path() + "/code");
-        QVERIFY(code.open(QIODevice::ReadOnly));
-        QCOMPARE(code.readAll(), QByteArray("0\n"));
-        QFile errors(big.path() + "/err");
-        QVERIFY(errors.open(QIODevice::ReadOnly));
-        const QString err = QString::fromUtf8(errors.readAll());
-        const QRegularExpressionMatch match =
-            QRegularExpression("^Found (\\d+) line\\(s\\) in \\d+ file\\(s\\) out of \\d+ "
-                               "file\\(s\\)\n$")
-                .match(err);
-        QVERIFY2(match.hasMatch(), qPrintable(err));
-        QVERIFY(match.captured(1).toInt() < 100 * 1000);
-    }
-
-    // Started with standard output closed, fif writes into no descriptor
-    // that happens to take its number, and says so.
-    void closedOutputAtStart()
-    {
-        if (QStandardPaths::findExecutable("bash").isEmpty())
-            QSKIP("bash is needed to close a descriptor");
-        QProcess shell;
-        shell.start("bash", {"-c", "\"$0\" needle \"$1\" >&-", program, root + "/src"});
-        QVERIFY(shell.waitForFinished(60000));
-        QCOMPARE(shell.exitCode(), 2);
-        QCOMPARE(shell.readAllStandardError(), QByteArray("fif: standard output is closed\n"));
+            QVERIFY(FifTest::write(big.path(), QString("f%1.txt").arg(f),
+                                   QByteArray("a line with a needle in it\n").repeated(1000)));
+        const QString script = "\"$0\" needle \"$1\" 2>\"$1/err\" | head -n 1; "
+                               "echo ${PIPESTATUS[0]}; cat \"$1/err\"";
+        const QStringList lines = run({"bash", "-c", script, fif, big.path()}).out.split('\n');
+        const int found = lines.value(2).section(' ', 1, 1).toInt(); // "Found <n> line(s) ..."
+        QVERIFY2(lines.size() == 4 && lines[0].endsWith("): a line with a needle in it")
+                     && lines[1] == "0" && found > 0 && found < 100 * 1000,
+                 qPrintable(lines.join('\n')));
+        const Run closed = run({"bash", "-c", "\"$0\" needle \"$1\" >&-", fif, big.path()});
+        QVERIFY(closed.code == 2 && closed.err == "fif: standard output is closed\n");
     }
 };
 

@@ -13,6 +13,7 @@
 
 #include <QAbstractItemModelTester>
 #include <QApplication>
+#include <QComboBox>
 #include <QDir>
 #include <QEventLoop>
 #include <QFile>
@@ -99,6 +100,22 @@ inline bool run(FifJob* job, const FifInput& input, int timeoutMs = 20000)
 {
     EndWatcher watcher(job);
     return job->start(input) && watcher.wait(timeoutMs);
+}
+
+// Keeps the job's search thread at its start, running, until the job is
+// asked to stop: a search that is surely still busy.
+inline QMetaObject::Connection holdUntilStopped(FifJob* job)
+{
+    const auto hold = [job] { while (!job->shouldStop()) QThread::msleep(2); };
+    return QObject::connect(job, &QThread::started, job, hold, Qt::DirectConnection);
+}
+
+inline QStringList items(const QComboBox* box)
+{
+    QStringList list;
+    for (int i = 0; i < box->count(); ++i)
+        list << box->itemText(i);
+    return list;
 }
 
 // Calls `answer` once with the next modal widget of type T, from inside that
