@@ -85,6 +85,11 @@ private slots:
             "needles, needle", nullptr, "1|needles, needle|9|needle");
         row("moved to its start", literal, "x\nab needle", "x\nneedle ab", "2|needle ab|0|needle");
         row("gone from its line", literal, "x\nab needle", "new\nx\nab needle", "2|x|0|x");
+        // Decoded as the search read it: UTF-32, and a second mark that is text.
+        QTest::newRow("UTF-32") << literal << QByteArray(QStringEncoder(QStringEncoder::Utf32BE,
+            QStringEncoder::Flag::WriteBom).encode(u"x\nab needle")) << QByteArray() << QString("2|ab needle|3|needle");
+        QTest::newRow("UTF-8, mark twice") << literal << QByteArray("\xEF\xBB\xBF\xEF\xBB\xBFx needle")
+                                           << QByteArray() << QString("1|%1x needle|3|needle").arg(QChar(0xFEFF));
     }
     void viewerSelectsTheMatch() {
         QFETCH(FifInput, request); QFETCH(QByteArray, bytes); QFETCH(QByteArray, changed);

@@ -97,6 +97,9 @@ private slots:
                                      .pixmap(24).toImage().convertToFormat(QImage::Format_Alpha8);
             const auto painted = 24 * 24 - std::count(alpha.bits(), alpha.bits() + 24 * 24, 0);
             QVERIFY2(painted > 24 * 24 / 10 && painted < 24 * 24, id); // drawn, not a square
+            // Made once: a second request shares the first's engine and its cached pixmaps.
+            QCOMPARE(ImageManager::getInstance()->getIcon(QString("gui-orba-") + id).cacheKey(),
+                     ImageManager::getInstance()->getIcon(QString("gui-orba-") + id).cacheKey());
         }
     }
     // Written in full, or a failure reported with the earlier file kept as it
