@@ -62,7 +62,7 @@ private slots:
         const QString before = onScreen(viewer) + viewer->toPlainText();
         const QString gone = QDir(dir.path()).absoluteFilePath(hits.first().file);
         QVERIFY(QFile::remove(gone));
-        emit tree->doubleClicked(tree->model()->index(0, 0));
+        emit tree->activated(tree->model()->index(0, 0));
         QCOMPARE(window.statusBar()->currentMessage(),
                  QDir::toNativeSeparators(gone) + " no longer exists.");
         QCOMPARE(onScreen(viewer) + viewer->toPlainText(), before);
