@@ -135,8 +135,7 @@ void FileViewer::contextMenuEvent(QContextMenuEvent* event)
 void FileViewer::resizeEvent(QResizeEvent* event)
 {
     QPlainTextEdit::resizeEvent(event);
-    const QRect area = contentsRect();
-    gutter->setGeometry(area.left(), area.top(), gutter->sizeHint().width(), area.height());
+    updateGutter();
 }
 
 void FileViewer::updateGutter()

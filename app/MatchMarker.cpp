@@ -15,6 +15,7 @@ constexpr qint64 turnMs = 15;
 MatchMarker::MatchMarker(QPlainTextEdit* view)
     : QObject(view)
     , view(view)
+    , viewport(view->viewport())
 {
     timer.setSingleShot(true);
     timer.setInterval(0);
@@ -27,7 +28,7 @@ MatchMarker::MatchMarker(QPlainTextEdit* view)
         found.clear();
         waiting.clear();
     });
-    view->viewport()->installEventFilter(this);
+    viewport->installEventFilter(this);
 }
 
 void MatchMarker::mark(const QRegExp& expression, int line)
@@ -46,8 +47,10 @@ int MatchMarker::getMarkedLine() const
 
 bool MatchMarker::eventFilter(QObject* watched, QEvent* event)
 {
-    if (watched == view->viewport() && event->type() == QEvent::Resize)
-        timer.start(); // after the view has laid out its new size
+    // Once the view has laid out its new size. The viewport is not asked of
+    // the view, which may be on its way out.
+    if (event->type() == QEvent::Resize && watched == viewport)
+        QMetaObject::invokeMethod(this, &MatchMarker::followView, Qt::QueuedConnection);
     return QObject::eventFilter(watched, event);
 }
 
@@ -77,10 +80,6 @@ void MatchMarker::followView()
 
 void MatchMarker::matchSome()
 {
-    if (waiting.isEmpty()) { // a resize: the lines in view may have changed
-        followView();
-        return;
-    }
     QElapsedTimer clock;
     clock.start();
     while (!waiting.isEmpty() && !clock.hasExpired(turnMs)) {

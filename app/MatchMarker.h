@@ -51,6 +51,7 @@ private:
     void apply();
 
     QPlainTextEdit* view;
+    QObject* viewport;
     QRegExp rx;
     int markedLine = 0;
     QHash<int, Line> found;  // by block number, of the lines in view only
