@@ -175,7 +175,6 @@ private slots:
         QTest::keyClick(f.tree(), Qt::Key_Return); // the current row, once
         SingleClickStyle style; // a double-click is still one showing
         f.tree()->setStyle(&style);
-        QTest::qWait(QApplication::doubleClickInterval() + 50);
         QTest::mouseDClick(f.dock.windowHandle(), Qt::LeftButton, {},
                            f.tree()->viewport()->mapTo(&f.dock, f.tree()->visualRect(f.index(3)).center()));
         f.tree()->setStyle(nullptr);
