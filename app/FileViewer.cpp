@@ -4,13 +4,25 @@
 #include "FifHit.h"
 #include "FifInput.h"
 #include "FifJob.h"
+#include "ImageManager.h"
+#include "LineNumberGutter.h"
+#include "MatchMarker.h"
 
+#include <QAction>
+#include <QClipboard>
+#include <QContextMenuEvent>
+#include <QDesktopServices>
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
 #include <QFontDatabase>
+#include <QGuiApplication>
+#include <QMenu>
 #include <QTextBlock>
+#include <QUrl>
 #include <QtCore5Compat/QRegExp>
+
+#include <memory>
 
 namespace {
 
@@ -41,6 +53,29 @@ FileViewer::FileViewer(QWidget* parent)
     setFont(QFontDatabase::systemFont(QFontDatabase::FixedFont));
     setPlaceholderText(tr("Find text in files with Edit > Find in Files (Ctrl+Shift+F); "
                           "the result chosen in the results dock is shown here."));
+
+    gutter = new LineNumberGutter(this);
+    connect(this, &QPlainTextEdit::blockCountChanged, this, &FileViewer::updateGutter);
+    connect(this, &QPlainTextEdit::updateRequest, gutter, &LineNumberGutter::follow);
+    updateGutter();
+    marker = new MatchMarker(this);
+
+    auto* images = Gui::Orba::ImageManager::getInstance();
+    openInEditorAction = new QAction(images->getIcon(QStringLiteral("gui-orba-open-in-editor")),
+                                     tr("Open in &Editor"), this);
+    openInEditorAction->setObjectName(QStringLiteral("openInEditor"));
+    openInEditorAction->setShortcut(QKeySequence(Qt::CTRL | Qt::Key_E));
+    openInEditorAction->setToolTip(tr("Open the File in Its Editor"));
+    openInEditorAction->setEnabled(false);
+    connect(openInEditorAction, &QAction::triggered, this, &FileViewer::openInEditor);
+    copyPathAction = new QAction(images->getIcon(QStringLiteral("gui-orba-copy-path")),
+                                 tr("Copy &Path"), this);
+    copyPathAction->setObjectName(QStringLiteral("copyPath"));
+    copyPathAction->setToolTip(tr("Copy the File's Path"));
+    copyPathAction->setEnabled(false);
+    connect(copyPathAction, &QAction::triggered, this, [this] {
+        QGuiApplication::clipboard()->setText(QDir::toNativeSeparators(filePath));
+    });
 }
 
 bool FileViewer::showHit(const Gui::Orba::FifHit& hit, QString* error)
@@ -73,6 +108,49 @@ int FileViewer::getCurrentLine() const
     return textCursor().blockNumber() + 1;
 }
 
+int FileViewer::getMarkedLine() const
+{
+    return marker->getMarkedLine();
+}
+
+QAction* FileViewer::getOpenInEditorAction() const
+{
+    return openInEditorAction;
+}
+
+QAction* FileViewer::getCopyPathAction() const
+{
+    return copyPathAction;
+}
+
+void FileViewer::contextMenuEvent(QContextMenuEvent* event)
+{
+    std::unique_ptr<QMenu> menu(createStandardContextMenu(event->pos()));
+    menu->addSeparator();
+    menu->addAction(openInEditorAction);
+    menu->addAction(copyPathAction);
+    menu->exec(event->globalPos());
+}
+
+void FileViewer::resizeEvent(QResizeEvent* event)
+{
+    QPlainTextEdit::resizeEvent(event);
+    updateGutter();
+}
+
+void FileViewer::updateGutter()
+{
+    setViewportMargins(gutter->sizeHint().width(), 0, 0, 0);
+    const QRect area = contentsRect();
+    gutter->setGeometry(area.left(), area.top(), gutter->sizeHint().width(), area.height());
+}
+
+void FileViewer::openInEditor()
+{
+    if (!filePath.isEmpty() && !QDesktopServices::openUrl(QUrl::fromLocalFile(filePath)))
+        emit failed(tr("No application opens %1.").arg(QDir::toNativeSeparators(filePath)));
+}
+
 bool FileViewer::loadFile(const QString& path, QString* error)
 {
     const QFileInfo info(path);
@@ -103,6 +181,8 @@ bool FileViewer::loadFile(const QString& path, QString* error)
     filePath = path;
     fileModified = info.lastModified();
     fileSize = info.size();
+    openInEditorAction->setEnabled(true);
+    copyPathAction->setEnabled(true);
     emit fileOpened(path);
     return true;
 }
@@ -113,25 +193,25 @@ void FileViewer::selectMatch(const Gui::Orba::FifHit& hit)
     if (!block.isValid()) // the file has lost lines since the search
         block = document()->lastBlock();
     const QString text = block.text();
+    const QRegExp rx = hit.job ? hit.job->getInput().getRegExp() : QRegExp();
 
-    // The hit's offset counts from the start of the file; the match's column
-    // is its distance from the line's start. The match's length comes from
-    // matching the job's request on the line again, where the job still
-    // exists; a line that has changed since is searched for the match anew.
-    int column = hit.offset - block.position();
-    int length = -1;
-    if (hit.job) {
-        QRegExp rx = hit.job->getInput().getRegExp();
-        if (column >= 0 && column <= text.size() && rx.indexIn(text, column) == column) {
-            length = rx.matchedLength();
-        } else if (rx.indexIn(text) >= 0) {
-            column = rx.pos();
-            length = rx.matchedLength();
+    // On a line as the search read it, the hit tells where its match is. A
+    // line changed since is matched again: at the hit's column first, else
+    // anywhere; with nothing to go by, the whole line is selected.
+    int column = hit.column;
+    int length = hit.length;
+    if (column < 0 || text != toDocumentText(hit.text)) {
+        column = hit.offset - block.position();
+        QRegExp again = rx;
+        if (column >= 0 && column <= text.size() && again.indexIn(text, column) == column) {
+            length = again.matchedLength();
+        } else if (again.indexIn(text) >= 0) {
+            column = again.pos();
+            length = again.matchedLength();
+        } else {
+            column = 0;
+            length = text.size();
         }
-    }
-    if (length < 0) { // nothing to go by: the whole line
-        column = 0;
-        length = text.size();
     }
 
     QTextCursor cursor(block);
@@ -139,10 +219,5 @@ void FileViewer::selectMatch(const Gui::Orba::FifHit& hit)
     cursor.setPosition(block.position() + column + length, QTextCursor::KeepAnchor);
     setTextCursor(cursor);
     centerCursor();
-
-    QTextEdit::ExtraSelection line;
-    line.format.setBackground(palette().alternateBase());
-    line.format.setProperty(QTextFormat::FullWidthSelection, true);
-    line.cursor = QTextCursor(block);
-    setExtraSelections({line});
+    marker->mark(rx, block.blockNumber() + 1);
 }

@@ -42,6 +42,8 @@ FindInFilesWindow::FindInFilesWindow(const QString& folder, QWidget* parent)
     connect(viewer, &FileViewer::fileOpened, this, [this](const QString& path) {
         setWindowTitle(tr("Find in Files - %1").arg(QDir::toNativeSeparators(path)));
     });
+    connect(viewer, &FileViewer::failed, this,
+            [this](const QString& message) { statusBar()->showMessage(message, messageTimeoutMs); });
 
     createActions();
     createDocks();
@@ -180,6 +182,10 @@ void FindInFilesWindow::createDocks()
 void FindInFilesWindow::createMenus()
 {
     QMenu* fileMenu = menuBar()->addMenu(tr("&File"));
+    fileMenu->setObjectName(QStringLiteral("fileMenu"));
+    fileMenu->addAction(viewer->getOpenInEditorAction());
+    fileMenu->addAction(viewer->getCopyPathAction());
+    fileMenu->addSeparator();
     QAction* quit = fileMenu->addAction(tr("&Quit"), this, &QWidget::close);
     quit->setObjectName(QStringLiteral("quit"));
     quit->setShortcut(QKeySequence::Quit);
@@ -213,4 +219,7 @@ void FindInFilesWindow::createMenus()
     toolBar->addAction(previousAction);
     toolBar->addAction(nextAction);
     toolBar->addAction(stopAction);
+    toolBar->addSeparator();
+    toolBar->addAction(viewer->getOpenInEditorAction());
+    toolBar->addAction(viewer->getCopyPathAction());
 }

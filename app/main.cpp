@@ -5,18 +5,21 @@
 #include <QCommandLineParser>
 #include <QDir>
 #include <QFileInfo>
+#include <QGuiApplication>
 
 #include <cstdio>
+#include <cstring>
 
-int main(int argc, char** argv)
+namespace {
+
+void describe(QCommandLineParser& parser)
 {
-    Gui::Orba::ApplicationBase app(argc, argv);
     // The settings file lives under this name in the user's configuration
-    // folder.
+    // folder; the desktop entry, under which a desktop lists the windows.
     QCoreApplication::setApplicationName(QStringLiteral("findinfiles"));
     QCoreApplication::setApplicationVersion(QStringLiteral(FIF_VERSION));
+    QGuiApplication::setDesktopFileName(QStringLiteral("findinfiles"));
 
-    QCommandLineParser parser;
     parser.setApplicationDescription(
         QCoreApplication::translate("main", "Finds text in files and shows each result."));
     parser.addHelpOption();
@@ -26,6 +29,35 @@ int main(int argc, char** argv)
         QCoreApplication::translate("main", "The folder to search first (default: the "
                                             "current directory)."),
         QStringLiteral("[FOLDER]"));
+}
+
+// Whether the arguments ask only for the help or the version, which are
+// answered without a display.
+bool asksForText(int argc, char** argv)
+{
+    for (int i = 1; i < argc && std::strcmp(argv[i], "--") != 0; ++i) {
+        for (const char* option : {"-h", "-?", "--help", "--help-all", "-v", "--version"}) {
+            if (std::strcmp(argv[i], option) == 0)
+                return true;
+        }
+    }
+    return false;
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+    if (asksForText(argc, argv)) {
+        QCoreApplication app(argc, argv);
+        QCommandLineParser parser;
+        describe(parser);
+        parser.process(app); // prints and ends the program
+    }
+
+    Gui::Orba::ApplicationBase app(argc, argv);
+    QCommandLineParser parser;
+    describe(parser);
     parser.process(app);
 
     const QStringList arguments = parser.positionalArguments();

@@ -3,6 +3,7 @@
 #include "ApplicationBase.h"
 #include "ChaseWidget.h"
 #include "FifDialog.h"
+#include "FifHitDelegate.h"
 #include "FifHitsModel.h"
 #include "FifInput.h"
 #include "FifJob.h"
@@ -110,13 +111,16 @@ FifHitsView::FifHitsView(FifJob* job, QWidget* parent)
     // Many rows may stream in: equal heights spare the view measuring each one.
     treeView->setUniformRowHeights(true);
     treeView->setRootIsDecorated(false);
+    treeView->setItemDelegate(new FifHitDelegate(treeView));
     vboxLayout->addWidget(treeView);
 
     connect(saveAction, &QAction::triggered, this, &FifHitsView::saveAs);
     connect(nextCommand.own, &QAction::triggered, this, &FifHitsView::next);
     connect(previousCommand.own, &QAction::triggered, this, &FifHitsView::previous);
     connect(showCurrentAction, &QAction::triggered, this, &FifHitsView::showCurrentIndex);
-    connect(treeView, &QAbstractItemView::doubleClicked, this, &FifHitsView::showIndex);
+    // Enter, and a double-click (or the single click of styles that open items
+    // so); a double-click is one activation whatever the style.
+    connect(treeView, &QAbstractItemView::activated, this, &FifHitsView::showIndex);
 
     setJob(job);
 

@@ -22,7 +22,8 @@ class FifJob;
 
 // Shows the hits of one search job: a tool bar with the view's commands, a
 // status line and a busy indicator above a flat list of hit lines. The hit
-// the user steps to, goes to or double-clicks is handed out through showHit.
+// the user steps to, goes to, double-clicks or presses Enter on is handed out
+// through showHit. Each row shows its match highlighted.
 class FIF_EXPORT FifHitsView : public QWidget
 {
     Q_OBJECT

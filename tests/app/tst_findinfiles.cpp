@@ -7,6 +7,7 @@
 #include "FifTest.h"
 #include "FileViewer.h"
 #include "FindInFilesWindow.h"
+#include "MatchMarker.h"
 #include <QtTest>
 #include <QtWidgets>
 
@@ -20,9 +21,25 @@ static QString onScreen(const FileViewer* viewer)
         .arg(cursor.selectionStart() - cursor.block().position()).arg(cursor.selectedText());
 }
 
+// The viewer's marks in order, as "line:column:text", a marked line as "line:line".
+static QStringList marks(const FileViewer* viewer)
+{
+    QStringList list;
+    for (const QTextEdit::ExtraSelection& mark : viewer->extraSelections())
+        list << QString("%1:%2").arg(mark.cursor.blockNumber() + 1).arg(mark.cursor.hasSelection()
+            ? QString("%1:%2").arg(mark.cursor.selectionStart() - mark.cursor.block().position())
+                  .arg(mark.cursor.selectedText()) : "line");
+    list.sort();
+    return list;
+}
+
 class tst_FindInFiles : public QObject
 {
     Q_OBJECT
+public slots:
+    void open(const QUrl& url) { opened << url; } // the desktop's handler of files, in the test
+private:
+    QList<QUrl> opened;
 private slots:
     void endToEnd() {
         QTemporaryDir dir;
@@ -62,10 +79,78 @@ private slots:
         const QString before = onScreen(viewer) + viewer->toPlainText();
         const QString gone = QDir(dir.path()).absoluteFilePath(hits.first().file);
         QVERIFY(QFile::remove(gone));
-        emit tree->doubleClicked(tree->model()->index(0, 0));
+        emit tree->activated(tree->model()->index(0, 0));
         QCOMPARE(window.statusBar()->currentMessage(),
                  QDir::toNativeSeparators(gone) + " no longer exists.");
         QCOMPARE(onScreen(viewer) + viewer->toPlainText(), before);
+    }
+    // The viewer numbers the lines and marks every match on the lines in view, as they come into
+    // view, of a long line those around the part in view; the hit's line stays marked. It opens
+    // its file in the desktop's editor (Ctrl+E, menus), copies its path, reloads a changed file.
+    void viewerWorthKeepingOpen() {
+        QTemporaryDir dir;
+        QByteArray bytes, wide;
+        for (int i = 1; i <= 1500; ++i)
+            bytes += QByteArray::number(i) + (i % 3 ? " needle, xNeedle\n" : " nothing\n");
+        for (int i = 0; i < 40; ++i)
+            wide += "needle" + QByteArray(100, '.');
+        QVERIFY(FifTest::write(dir.path(), "f.txt", bytes + wide + "\n"));
+        FindInFilesWindow window(dir.path());
+        window.show();
+        QApplication::setActiveWindow(&window);
+        FifJob* job = FifManager::getInstance(&window)->getJob(0);
+        FifTest::watch(job->getHitsModel());
+        QVERIFY(QTest::qWaitForWindowActive(&window) && FifTest::run(job, FifTest::request("needle", dir.path())));
+        const QList<FifHit> hits = FifTest::hits(job->getHitsModel());
+        FileViewer* viewer = window.getViewer();
+        auto* gutter = viewer->findChild<QWidget*>("lineNumbers");
+        QCOMPARE(viewer->getOpenInEditorAction()->isEnabled(), false);
+        window.showHit(hits.value(500)); // line 751
+        const auto inView = [viewer](bool first) {
+            return viewer->cursorForPosition(QPoint(0, first ? 0 : viewer->viewport()->height())).blockNumber() + 1;
+        };
+        const auto expected = [&] { // plain matching of the lines in view
+            QStringList list{"751:line"};
+            for (int line = inView(true); line <= inView(false) && line <= 1500; ++line) {
+                const QString text = viewer->document()->findBlockByNumber(line - 1).text();
+                for (int at = 0; (at = text.indexOf("needle", at, Qt::CaseInsensitive)) >= 0; at += 6)
+                    list << QString("%1:%2:%3").arg(line).arg(at).arg(text.mid(at, 6));
+            }
+            list.sort();
+            return list;
+        };
+        QVERIFY(inView(true) > 700 && inView(false) < 800 && viewer->getMarkedLine() == 751);
+        QTRY_COMPARE(marks(viewer), expected());
+        const QImage numbers = gutter->grab().toImage();
+        viewer->verticalScrollBar()->setValue(viewer->verticalScrollBar()->value() + 40);
+        QTRY_COMPARE(marks(viewer), expected());
+        QVERIFY(gutter->grab().toImage() != numbers && gutter->width() > gutter->fontMetrics().horizontalAdvance("1501"));
+        QCOMPARE(viewer->viewport()->x(), gutter->geometry().right() + 1); // beside the text
+        window.showHit(hits.constLast()); // the wide line: the matches around the part in view
+        QTRY_VERIFY(marks(viewer).contains("1501:0:needle") && !marks(viewer).contains("1501:3180:needle"));
+        viewer->horizontalScrollBar()->setValue(viewer->horizontalScrollBar()->maximum());
+        QTRY_VERIFY(!marks(viewer).contains("1501:0:needle") && marks(viewer).contains("1501:4134:needle"));
+        QVERIFY(marks(viewer).filter(QRegularExpression("^1501:")).size() <= MatchMarker::lineWindow / 106 + 2);
+        // Open in Editor through its shortcut, the menu and the viewer's context menu; Copy Path.
+        QDesktopServices::setUrlHandler("file", this, "open");
+        QTest::keyClick(&window, Qt::Key_E, Qt::ControlModifier);
+        window.findChild<QMenu*>("fileMenu")->actions().at(0)->trigger();
+        QTimer::singleShot(100, viewer, [] { // in the viewer's context menu
+            auto* menu = qobject_cast<QMenu*>(QApplication::activePopupWidget());
+            for (QAction* action : menu->actions())
+                if (action->objectName() == "openInEditor")
+                    action->trigger();
+            menu->close();
+        });
+        QContextMenuEvent menuEvent(QContextMenuEvent::Mouse, QPoint(5, 5), viewer->mapToGlobal(QPoint(5, 5)));
+        QApplication::sendEvent(viewer->viewport(), &menuEvent);
+        QDesktopServices::unsetUrlHandler("file");
+        QCOMPARE(opened, QList<QUrl>(3, QUrl::fromLocalFile(viewer->getFilePath())));
+        window.findChild<QToolBar*>("mainToolBar")->actions().constLast()->trigger(); // Copy Path
+        QCOMPARE(QGuiApplication::clipboard()->text(), QDir::toNativeSeparators(viewer->getFilePath()));
+        QVERIFY(FifTest::write(dir.path(), "f.txt", "needle\n"));
+        window.showHit(hits.first());
+        QCOMPARE(viewer->toPlainText(), QString("needle\n"));
     }
     // The viewer selects what the hit's search matched on the hit's line; in
     // a file changed since, the match on that line, else the whole line.

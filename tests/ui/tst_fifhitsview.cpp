@@ -1,8 +1,10 @@
 #include "ChaseWidget.h"
 #include "FifDialog.h"
+#include "FifHitDelegate.h"
 #include "FifHitsView.h"
 #include "FifManager.h"
 #include "FifSettings.h"
+#include "FifReference.h"
 #include "FifTest.h"
 
 #include <QtTest>
@@ -11,6 +13,17 @@
 using namespace Gui::Orba;
 using FifTest::holdUntilStopped;
 using FifTest::items;
+
+// A style that activates items on a single click, as some desktops do.
+struct SingleClickStyle : QProxyStyle
+{
+    int styleHint(StyleHint hint, const QStyleOption* option, const QWidget* widget,
+                  QStyleHintReturn* data) const override
+    {
+        return hint == SH_ItemView_ActivateItemOnSingleClick
+                   ? 1 : QProxyStyle::styleHint(hint, option, widget, data);
+    }
+};
 
 // A results view in a shown dock, on job 0 of its own manager, over `files`
 // files with `hits` lines holding "needle" each and `plain` files without.
@@ -116,7 +129,8 @@ private slots:
 
     // The find command opens the dialog on the view's own job, on the manager's filters
     // first and on the last search later. Steps, wrap prompts, goto and double-click each
-    // hand out one hit, the right one, also through shared actions linked twice; a current
+    // hand out one hit, the right one, and so do Enter and a double-click in a style that
+    // activates on a single click, also through shared actions linked twice; a current
     // row never selected counts as none. Save writes the list to a file.
     void findNavigateAndSave()
     {
@@ -158,11 +172,17 @@ private slots:
         f.tree()->setCurrentIndex(f.index(2)); f.action("show-current-fifhit")->trigger();
         const QPoint cell = f.tree()->viewport()->mapTo(&f.dock, f.tree()->visualRect(f.index(1)).center());
         QTest::mouseDClick(f.dock.windowHandle(), Qt::LeftButton, {}, cell); // as the platform delivers it
+        QTest::keyClick(f.tree(), Qt::Key_Return); // the current row, once
+        SingleClickStyle style; // a double-click is still one showing
+        f.tree()->setStyle(&style);
+        QTest::mouseDClick(f.dock.windowHandle(), Qt::LeftButton, {},
+                           f.tree()->viewport()->mapTo(&f.dock, f.tree()->visualRect(f.index(3)).center()));
+        f.tree()->setStyle(nullptr);
         f.view->unlinkActions(); next.trigger();
         QStringList rows, expected;
         for (const QList<QVariant>& signal : shown)
             rows << signal.at(0).value<FifHit>().toString();
-        for (int row : {0, 1, 2, 3, 0, 3, 2, 3, 0, 2, 1})
+        for (int row : {0, 1, 2, 3, 0, 3, 2, 3, 0, 2, 1, 1, 3})
             expected << FifTest::hits(f.job->getHitsModel()).value(row).toString();
         QCOMPARE(rows, expected);
         QCOMPARE(prompts, QStringList({"Reach bottom", "Reach bottom", "Reach top", "Reach top"}));
@@ -180,6 +200,81 @@ private slots:
         QVERIFY(file.atEnd() && find("needle 1"));
         QCOMPARE(seen.mid(3), QStringList({"needle", f.dir.path(), "*.txt"}));
         QCOMPARE(f.label(), QString("Found 1 line(s) in 1 file(s) out of 4 file(s)")); // "needle 100"
+    }
+
+    // Each row shows its line's first match highlighted, found where a plain reading of the
+    // file finds it, after any file name and line; painted over those characters, in the
+    // highlight colours, swapped in the selected row.
+    void matchesHighlighted_data()
+    {
+        QTest::addColumn<FifInput>("request");
+        QTest::addColumn<QString>("file");
+        QTest::addColumn<QByteArray>("bytes");
+        const QString text = "x\nGrüße 😀 needles, NEEDLE\r\n  needle_1 ä needle-2 needle\n";
+        const auto row = [&](const char* name, const FifInput& request, const char* file) {
+            QTest::newRow(name) << request << file << text.toUtf8();
+        };
+        row("literal", FifTest::request("needle", {}), "ä/ö (2).txt");
+        row("literal, case", FifTest::request("NEEDLE", {}, QRegExp::FixedString, true), "a.txt");
+        row("wildcard", FifTest::request("n?ed*s", {}, QRegExp::Wildcard), "a.txt");
+        row("regexp", FifTest::request("ne+dle-\\d", {}, QRegExp::RegExp2), "a.txt");
+        row("word", FifTest::request("needle", {}, QRegExp::FixedString, false, true), "a.txt");
+        QTest::newRow("UTF-16") << FifTest::request("needle", {}) << "b.txt"
+            << QByteArray(QStringEncoder(QStringEncoder::Utf16BE, QStringEncoder::Flag::WriteBom)(text));
+    }
+    void matchesHighlighted()
+    {
+        QFETCH(FifInput, request); QFETCH(QString, file); QFETCH(QByteArray, bytes);
+        Fixture f(0, 0);
+        f.dock.resize(1000, 300);
+        request.where = f.dir.path();
+        QVERIFY(f.ready && FifTest::write(f.dir.path(), file, bytes) && FifTest::run(f.job, request));
+        QRegExp rx = request.getRegExp();
+        const QList<FifReference::Line> lines = FifReference::lines(bytes);
+        auto* delegate = qobject_cast<FifHitDelegate*>(f.tree()->itemDelegate());
+        const int rows = f.tree()->model()->rowCount();
+        QVERIFY(delegate && rows > 0 && rows == FifReference::matches(bytes, rx).size());
+        const QFontMetrics metrics = f.tree()->fontMetrics();
+        const QPalette::ColorGroup group = f.tree()->isActiveWindow() ? QPalette::Active : QPalette::Inactive;
+        const QColor highlight = f.tree()->palette().color(group, QPalette::Highlight);
+        const QColor highlightedText = f.tree()->palette().color(group, QPalette::HighlightedText);
+        QSet<int> origins; // where each row's text starts, as the painted match tells
+        for (int row = 0; row < rows; ++row) {
+            const FifHit hit = FifTest::hits(f.job->getHitsModel()).at(row);
+            const QString shown = f.index(row).data().toString();
+            const QString prefix = QString("%1 (%2): ").arg(QDir::toNativeSeparators(hit.file)).arg(hit.line);
+            const int column = rx.indexIn(lines.value(hit.line - 1).text);
+            const FifHitDelegate::Range range = delegate->matchRange(f.index(row));
+            QCOMPARE(QString("%1+%2").arg(range.start).arg(range.length),
+                     QString("%1+%2").arg(prefix.size() + column).arg(rx.matchedLength()));
+            QVERIFY(column >= 0 && shown.startsWith(prefix) && shown.mid(range.start, range.length) == rx.cap(0));
+            // Not selected: the columns holding the highlight colour span the match.
+            const QRect cell = f.tree()->visualRect(f.index(row));
+            f.tree()->clearSelection();
+            QImage shot = f.tree()->viewport()->grab().toImage();
+            int first = -1, last = -1;
+            for (int x = cell.left(); x <= cell.right(); ++x)
+                for (int y = cell.top(); y <= cell.bottom(); ++y)
+                    if (shot.pixelColor(x, y) == highlight) {
+                        (first < 0 ? first : last) = x;
+                        break;
+                    }
+            QVERIFY2(qAbs(last - first + 1 - metrics.horizontalAdvance(rx.cap(0))) <= 1, qPrintable(shown));
+            origins << first - metrics.horizontalAdvance(shown.left(range.start));
+            // Selected: the match's background is the highlighted text's colour, the row's is not.
+            f.tree()->selectionModel()->select(f.index(row), QItemSelectionModel::ClearAndSelect);
+            shot = f.tree()->viewport()->grab().toImage();
+            const auto share = [&](int from, int to) {
+                int hits = 0;
+                for (int x = from; x <= to; ++x)
+                    for (int y = cell.top(); y <= cell.bottom(); ++y)
+                        hits += shot.pixelColor(x, y) == highlightedText;
+                return double(hits) / ((to - from + 1) * cell.height());
+            };
+            QVERIFY(share(first, last) > 0.5 && share(cell.left(), first - 1) < 0.3 && share(last + 1, cell.right()) < 0.3);
+        }
+        QVERIFY2(origins.size() == 1 || qAbs(*origins.begin() - *std::next(origins.begin())) <= 1,
+                 qPrintable(QString::number(origins.values().constFirst())));
     }
 };
 
