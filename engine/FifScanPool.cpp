@@ -10,9 +10,10 @@ namespace Gui {
 namespace Orba {
 
 FifScanPool::FifScanPool(FifJob* owner, const QRegExp& expression, int threadCount,
-                         Receiver& reports)
+                         Receiver& reports, const Limits& bounds)
     : job(owner)
     , receiver(reports)
+    , limits(bounds)
 {
     // The scanners are built here, before any thread starts: each thread
     // then uses only its own, and the regular-expression engine Qt shares
@@ -29,7 +30,13 @@ FifScanPool::FifScanPool(FifJob* owner, const QRegExp& expression, int threadCou
             break;  // as many threads as the system gives
         }
     }
-    maxFiles = size_t(filesPerThread) * qMax<size_t>(threads.size(), 1);
+    maxFiles = size_t(qMax(limits.filesPerThread, 1)) * qMax<size_t>(threads.size(), 1);
+}
+
+FifScanPool::FifScanPool(FifJob* owner, const QRegExp& expression, int threadCount,
+                         Receiver& reports)
+    : FifScanPool(owner, expression, threadCount, reports, Limits())
+{
 }
 
 FifScanPool::~FifScanPool()
@@ -165,7 +172,8 @@ void FifScanPool::hitFound(File& file, const FifHit& hit)
     heldChars += hit.text.size();
     // The head never waits here, so this ends; advance() reports what is
     // held when the file comes to the head.
-    while ((heldHits > maxHeldHits || heldChars > maxHeldChars) && !isHead(file) && !stopping)
+    while ((heldHits > limits.heldHits || heldChars > limits.heldChars) && !isHead(file)
+           && !stopping)
         waitForChange(guard);
 }
 

@@ -49,8 +49,20 @@ public:
         virtual void fileEnded(bool hasHit) = 0;
     };
 
+    // Bounds of what is in flight: files per scanning thread, and the hits
+    // (and their characters) held for files not at the head.
+    struct Limits
+    {
+        int filesPerThread = 128;
+        qsizetype heldHits = 16384;
+        qint64 heldChars = 8 * 1024 * 1024;
+    };
+
     // With one thread, files are scanned on the walk's thread as they are
-    // handed in, and no thread is started.
+    // handed in, and no thread is started. A stop is the job's (none
+    // without a job).
+    FifScanPool(FifJob* job, const QRegExp& expression, int threadCount, Receiver& receiver,
+                const Limits& limits);
     FifScanPool(FifJob* job, const QRegExp& expression, int threadCount, Receiver& receiver);
     // Ends the threads (stopping them unless finish() was called) and waits
     // for them; what is still held is dropped.
@@ -65,12 +77,6 @@ public:
     // The job's stop flag, noted for the whole pool once seen. Not to be
     // called with the pool's lock held.
     bool shouldStop();
-
-    // Bounds of what is in flight: files per scanning thread, and the hits
-    // (and their characters) held for files not at the head.
-    static constexpr int filesPerThread = 128;
-    static constexpr qsizetype maxHeldHits = 16384;
-    static constexpr qint64 maxHeldChars = 8 * 1024 * 1024;
 
 private:
     struct File
@@ -100,6 +106,7 @@ private:
 
     FifJob* const job;
     Receiver& receiver;
+    const Limits limits;
     std::vector<std::unique_ptr<FifFileScanner>> scanners;
     std::vector<std::thread> threads;
     size_t maxFiles = 1;
