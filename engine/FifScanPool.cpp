@@ -46,8 +46,8 @@ FifScanPool::~FifScanPool()
         if (!noMoreFiles)
             stopping = true;
         noMoreFiles = true;
+        workAdded.notify_all();
     }
-    changed.notify_all();
     for (std::thread& thread : threads)
         thread.join();
 }
@@ -55,14 +55,17 @@ FifScanPool::~FifScanPool()
 bool FifScanPool::add(const QString& path)
 {
     std::unique_lock<std::mutex> guard(lock);
-    while (files.size() >= maxFiles && !stopping)
-        waitForChange(guard);
+    while (files.size() >= maxFiles && !stopping) {
+        walkWaits = true;
+        waitOn(roomMade, guard);
+    }
     if (stopping)
         return false;
     files.emplace_back();
     files.back().path = path;
     if (!threads.empty()) {
-        changed.notify_all();
+        if (idleThreads > 0)
+            workAdded.notify_one();
         return true;
     }
     // No thread of its own: the file is scanned here, at the head at once.
@@ -79,9 +82,11 @@ void FifScanPool::finish()
     {
         std::unique_lock<std::mutex> guard(lock);
         noMoreFiles = true;
-        changed.notify_all();
-        while (!files.empty() && !stopping)
-            waitForChange(guard);
+        workAdded.notify_all();
+        while (!files.empty() && !stopping) {
+            walkWaits = true;
+            waitOn(roomMade, guard);
+        }
     }
     for (std::thread& thread : threads)
         thread.join();
@@ -102,14 +107,16 @@ bool FifScanPool::shouldStop()
 void FifScanPool::noteStop()
 {
     stopping = true;
-    changed.notify_all();
+    workAdded.notify_all();
+    roomMade.notify_all();
+    headMoved.notify_all();
 }
 
-void FifScanPool::waitForChange(std::unique_lock<std::mutex>& guard)
+void FifScanPool::waitOn(std::condition_variable& condition, std::unique_lock<std::mutex>& guard)
 {
     // Normally a thread that polls the stop flag notes the stop for all;
     // the timeout covers a stop that comes while no thread polls.
-    if (changed.wait_for(guard, std::chrono::milliseconds(50)) == std::cv_status::timeout
+    if (condition.wait_for(guard, std::chrono::milliseconds(50)) == std::cv_status::timeout
         && job && job->shouldStop())
         noteStop();
 }
@@ -118,8 +125,11 @@ void FifScanPool::runThread(FifFileScanner& scanner)
 {
     std::unique_lock<std::mutex> guard(lock);
     for (;;) {
-        while (!stopping && taken == files.size() && !noMoreFiles)
-            waitForChange(guard);
+        while (!stopping && taken == files.size() && !noMoreFiles) {
+            ++idleThreads;
+            waitOn(workAdded, guard);
+            --idleThreads;
+        }
         if (stopping || taken == files.size())
             return;
         File& file = files[taken++];
@@ -173,8 +183,11 @@ void FifScanPool::hitFound(File& file, const FifHit& hit)
     // The head never waits here, so this ends; advance() reports what is
     // held when the file comes to the head.
     while ((heldHits > limits.heldHits || heldChars > limits.heldChars) && !isHead(file)
-           && !stopping)
-        waitForChange(guard);
+           && !stopping) {
+        ++heldWaiters;
+        waitOn(headMoved, guard);
+        --heldWaiters;
+    }
 }
 
 void FifScanPool::advance()
@@ -196,7 +209,6 @@ void FifScanPool::advance()
             }
             heldHits -= head.held.size();
             head.held.clear();
-            changed.notify_all();
         }
         if (head.state != File::Done)
             return;
@@ -204,7 +216,14 @@ void FifScanPool::advance()
             receiver.fileEnded(head.hasHit);
         files.pop_front();
         --taken;
-        changed.notify_all();
+        if (heldWaiters > 0)
+            headMoved.notify_all();
+        // The walk resumes once half the room is free, rather than for
+        // every file; finish() once all is reported.
+        if (walkWaits && files.size() <= maxFiles / 2 && (!noMoreFiles || files.empty())) {
+            walkWaits = false;
+            roomMade.notify_one();
+        }
     }
 }
 

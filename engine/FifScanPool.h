@@ -100,9 +100,9 @@ private:
     void advance();
     bool isHead(const File& file) const { return !files.empty() && &files.front() == &file; }
     void noteStop();
-    // Waits on `changed`, noticing a stop of the job even when no thread of
-    // the pool is there to poll it.
-    void waitForChange(std::unique_lock<std::mutex>& guard);
+    // Waits for `condition`, noticing a stop of the job even when no thread
+    // of the pool is there to poll it.
+    void waitOn(std::condition_variable& condition, std::unique_lock<std::mutex>& guard);
 
     FifJob* const job;
     Receiver& receiver;
@@ -112,7 +112,14 @@ private:
     size_t maxFiles = 1;
 
     std::mutex lock;
-    std::condition_variable changed;
+    // Each is notified only when someone waits for it: files were added,
+    // room made for the walk (or all reported), the head moved on.
+    std::condition_variable workAdded;
+    std::condition_variable roomMade;
+    std::condition_variable headMoved;
+    int idleThreads = 0;
+    int heldWaiters = 0;
+    bool walkWaits = false;
     // The files in flight in walk order; the first `taken` have been taken
     // by a thread. References stay valid while others come and go.
     std::deque<File> files;
