@@ -4,6 +4,7 @@
 
 #include "FifManager.h"
 #include "FifScanPool.h"
+#include "FifSettings.h"
 #include "FifReference.h"
 #include "FifTest.h"
 #include "FifWorker.h"
@@ -361,8 +362,13 @@ private slots:
         // Slots grow one at a time; a job gone from its slot is replaced.
         FifJob* zero = manager->getJob(3);
         QVERIFY(!manager->getJob(-1) && manager->getJob(0) == zero && manager->getJobCount() == 1);
-        zero->setThreadCount(-1);  // 0 or less: one per core
+        zero->setThreadCount(-1);  // 0 or less: one per core, also when the settings name no number
         QCOMPARE(zero->getThreadCount(), qMax(1, QThread::idealThreadCount()));
+        Settings store;
+        store.setValue("Find-In-Files/ThreadCount", "three");
+        QCOMPARE(FifSettings().getThreadCount(&store) + FifSettings().getThreadCount(nullptr), 0);
+        store.setValue(FifSettings().getThreadCountKeyPath(), 3);
+        QCOMPARE(FifSettings().getThreadCount(&store), 3);
         FifJob* one = manager->getJob(1);
         auto* mine = new FifJob(manager);
         QVERIFY(!manager->replaceJob(0, mine) && manager->replaceJob(1, mine) == one && manager->getJob(1) == mine);
