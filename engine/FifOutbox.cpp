@@ -38,6 +38,7 @@ void FifOutbox::post(Event&& event)
 {
     const bool here = QThread::currentThread() == thread();
     bool wake = false;
+    bool full = false;
     {
         std::lock_guard<std::mutex> guard(lock);
         weight += event.weight;
@@ -46,6 +47,7 @@ void FifOutbox::post(Event&& event)
             wakePending = true;
             wake = true;
         }
+        full = weight > capacity;
     }
     if (here) {
         deliverAll();
@@ -53,14 +55,14 @@ void FifOutbox::post(Event&& event)
     }
     if (wake)
         QMetaObject::invokeMethod(this, &FifOutbox::onWake, Qt::QueuedConnection);
+    if (!full)
+        return;
+    // Resumes at half the bound, so that a poster is not woken for every
+    // event the GUI thread takes.
     std::unique_lock<std::mutex> guard(lock);
-    if (weight > capacity && !interrupted) {
-        // Resumes at half the bound, so that a poster is not woken for
-        // every event the GUI thread takes.
-        ++waiting;
-        roomMade.wait(guard, [this] { return weight <= capacity / 2 || interrupted; });
-        --waiting;
-    }
+    ++waiting;
+    roomMade.wait(guard, [this] { return weight <= capacity / 2 || interrupted; });
+    --waiting;
 }
 
 void FifOutbox::setInterrupted(bool value)
