@@ -167,7 +167,6 @@ MainWindow* FifJob::getMainWindow() const
 // either way, without a lock and a variant per hit.
 void FifJob::appendHit(const FifHit& hit)
 {
-    FifHandOff::received(this);
     if (!hit.isValid())
         return;
     getHitsModel()->appendValidHits(FifHitList{hit}, 1);
@@ -175,7 +174,6 @@ void FifJob::appendHit(const FifHit& hit)
 
 void FifJob::appendHits(const FifHitList& hits)
 {
-    FifHandOff::received(this);
     int count = 0;
     for (const FifHit& hit : hits)
         count += hit.isValid() ? 1 : 0;
