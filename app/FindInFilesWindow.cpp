@@ -2,12 +2,15 @@
 
 #include "FileViewer.h"
 
+#include "ApplicationBase.h"
 #include "FifHandler.h"
 #include "FifHit.h"
 #include "FifHitsView.h"
 #include "FifInput.h"
+#include "FifJob.h"
 #include "FifManager.h"
 #include "FifResultsDockWidget.h"
+#include "FifSettings.h"
 #include "HelpManager.h"
 #include "ImageManager.h"
 
@@ -49,6 +52,11 @@ FindInFilesWindow::FindInFilesWindow(const QString& folder, QWidget* parent)
     createDocks();
     createMenus();
     updateFindAction();
+    // The searches of both docks scan with the threads the settings name.
+    ApplicationBase* application = ApplicationBase::getInstance();
+    const int threads = FifSettings().getThreadCount(application ? application->getSettings() : nullptr);
+    for (int slot = 0; slot < 2; ++slot)
+        FifManager::getInstance(this)->getJob(slot)->setThreadCount(threads);
     statusBar()->showMessage(tr("Ready"));
     resize(960, 720);
 }

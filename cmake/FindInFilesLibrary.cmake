@@ -10,6 +10,11 @@ file(GLOB FIF_UI_SOURCES CONFIGURE_DEPENDS
 # Headers that stay inside the library: not exported, not installed.
 set(FIF_PRIVATE_HEADERS
     ${PROJECT_SOURCE_DIR}/engine/FifWorker.h
+    ${PROJECT_SOURCE_DIR}/engine/FifScanPool.h
+    ${PROJECT_SOURCE_DIR}/engine/FifFileScanner.h
+    ${PROJECT_SOURCE_DIR}/engine/FifFolderWalker.h
+    ${PROJECT_SOURCE_DIR}/engine/FifNameFilter.h
+    ${PROJECT_SOURCE_DIR}/engine/FifOutbox.h
     ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h
     ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.h
     ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h

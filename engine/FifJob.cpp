@@ -4,6 +4,7 @@
 #include "FifHitsModel.h"
 #include "FifLocker.h"
 #include "FifManager.h"
+#include "FifOutbox.h"
 #include "FifWorker.h"
 
 namespace Gui {
@@ -11,14 +12,17 @@ namespace Orba {
 
 FifJob::FifJob(FifManager* manager)
     : QThread(manager)
+    , outbox(new FifOutbox(this))
     , workingDir(QString())
 {
     // QThread emits finished() just before it marks itself as not running.
     // Joining the thread here, ahead of every other receiver of finished(),
-    // lets those receivers rely on isRunning() being false.
+    // lets those receivers rely on isRunning() being false, and on having
+    // received everything the search found.
     connect(this, &QThread::finished, this, [this] {
         wait();
         FifHandOff::received(this);
+        outbox->deliverAll();
     });
 }
 
@@ -36,8 +40,10 @@ bool FifJob::start(const FifInput& request)
 {
     if (isRunning())
         return false;
-    // The last run's thread has ended: what it did comes before this run.
+    // The last run's thread has ended: what it did comes before this run,
+    // also what it found that its end has not delivered yet.
     FifHandOff::received(this);
+    outbox->deliverAll();
 
     input = request;
     FifHitsModel* model = getHitsModel();
@@ -58,14 +64,28 @@ bool FifJob::start(const FifInput& request)
 
 bool FifJob::shouldStop() const
 {
-    FifLocker locker(&lock, FifLocker::Read);
-    return stopFlag;
+    return stopFlag.load(std::memory_order_acquire);
 }
 
 void FifJob::setShouldStop(bool value)
 {
+    // Under the lock, so that the outbox learns the flags in the order they
+    // are set: a search thread waiting for room there must see a stop.
     FifLocker locker(&lock, FifLocker::Write);
-    stopFlag = value;
+    stopFlag.store(value, std::memory_order_release);
+    outbox->setInterrupted(value);
+}
+
+void FifJob::setThreadCount(int count)
+{
+    FifLocker locker(&lock, FifLocker::Write);
+    threadCount = count;
+}
+
+int FifJob::getThreadCount() const
+{
+    FifLocker locker(&lock, FifLocker::Read);
+    return threadCount > 0 ? threadCount : qMax(QThread::idealThreadCount(), 1);
 }
 
 void FifJob::stop()
@@ -147,7 +167,6 @@ MainWindow* FifJob::getMainWindow() const
 // either way, without a lock and a variant per hit.
 void FifJob::appendHit(const FifHit& hit)
 {
-    FifHandOff::received(this);
     if (!hit.isValid())
         return;
     getHitsModel()->appendValidHits(FifHitList{hit}, 1);
@@ -155,13 +174,27 @@ void FifJob::appendHit(const FifHit& hit)
 
 void FifJob::appendHits(const FifHitList& hits)
 {
-    FifHandOff::received(this);
     int count = 0;
     for (const FifHit& hit : hits)
         count += hit.isValid() ? 1 : 0;
     if (count == 0)
         return;
     getHitsModel()->appendValidHits(hits, count);
+}
+
+void FifJob::postSearching(const QString& file)
+{
+    outbox->postSearching(file);
+}
+
+void FifJob::postHit(const FifHit& hit)
+{
+    outbox->postHit(hit);
+}
+
+void FifJob::postHits(const FifHitList& hits)
+{
+    outbox->postHits(hits);
 }
 
 void FifJob::run()

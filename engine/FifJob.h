@@ -8,18 +8,25 @@
 #include <QReadWriteLock>
 #include <QThread>
 
+#include <atomic>
+
 namespace Gui {
 namespace Orba {
 
 class FifHitsModel;
 class FifManager;
+class FifOutbox;
 class MainWindow;
 
 // One search slot of a main window: runs one search at a time on its own
 // thread and keeps its request, hits, counters and stop flag.
 //
-// The counters and the stop flag are shared with the search thread and are
-// only touched under `lock`; the hits model is changed in the GUI thread only.
+// The counters are shared with the search threads and are only touched
+// under `lock`; the stop flag is changed under it too and read without it,
+// as the scanning threads poll it often. The hits model is changed in the
+// GUI thread only. What the search finds reaches the GUI thread through the
+// job's outbox, in walk order, and is all delivered before any receiver of
+// finished() other than the job's own runs.
 class FIF_EXPORT FifJob : public QThread
 {
     Q_OBJECT
@@ -37,6 +44,12 @@ public:
 
     bool shouldStop() const;
     void setShouldStop(bool stop);
+
+    // The threads that scan files in the next search; 0 or less means one
+    // per core. The getter gives the number that will be used (at least 1).
+    // With 1, files are scanned on the job's thread itself.
+    void setThreadCount(int count);
+    int getThreadCount() const;
 
     int getReadFileCount() const;
     int getFileHitCount() const;
@@ -71,13 +84,22 @@ protected:
     void run() override;
 
 private:
+    friend class FifWorker;
+    // The worker's events, handed to the outbox on the thread that reports
+    // them.
+    void postSearching(const QString& file);
+    void postHit(const Gui::Orba::FifHit& hit);
+    void postHits(const Gui::Orba::FifHitList& hits);
+
     mutable FifHitsModel* hitsModel = nullptr;
+    FifOutbox* outbox;
     QDir workingDir;
     FifInput input;
     mutable QReadWriteLock lock;
     int readFileCount = 0;
     int fileHitCount = 0;
-    bool stopFlag = false;
+    int threadCount = 0;
+    std::atomic<bool> stopFlag{false};
 };
 
 } // namespace Orba

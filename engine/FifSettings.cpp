@@ -53,6 +53,7 @@ FifSettings::FifSettings()
     , whereKey(QStringLiteral("WhereKey"))
     , filterKey(QStringLiteral("CurrentFilterKey"))
     , includeSubFolderKey(QStringLiteral("IncludeSubFolderKey"))
+    , threadCountKey(QStringLiteral("ThreadCount"))
 {
 }
 
@@ -66,6 +67,11 @@ QString FifSettings::getFilterKeyPath() const { return keyPath(findInFilesGroup,
 QString FifSettings::getIncludeSubFolderKeyPath() const
 {
     return keyPath(findInFilesGroup, includeSubFolderKey);
+}
+
+QString FifSettings::getThreadCountKeyPath() const
+{
+    return keyPath(findInFilesGroup, threadCountKey);
 }
 
 QString FifSettings::getWhatString(Settings* settings) const
@@ -94,6 +100,14 @@ QStringList FifSettings::getWhatHistory(Settings* settings) const
 QStringList FifSettings::getWhereHistory(Settings* settings) const
 {
     return settings ? getList(settings, getWhereKeyPath()) : QStringList();
+}
+
+int FifSettings::getThreadCount(Settings* settings) const
+{
+    int count = 0;
+    if (settings)
+        readInt(settings, getThreadCountKeyPath(), &count);
+    return count;
 }
 
 void FifSettings::readInput(Settings* settings, FifInput& input) const

@@ -25,6 +25,7 @@ public:
     QString getWhereKeyPath() const;
     QString getFilterKeyPath() const;
     QString getIncludeSubFolderKeyPath() const;
+    QString getThreadCountKeyPath() const;
 
     // The most recent entry of each history, or the stored filter; empty when
     // nothing usable is stored or there is no store.
@@ -34,6 +35,10 @@ public:
     // The histories of texts and folders, most recent first.
     QStringList getWhatHistory(Settings* settings) const;
     QStringList getWhereHistory(Settings* settings) const;
+    // The stored number of threads that scan files (see
+    // FifJob::setThreadCount); 0, one per core, when none is stored or the
+    // value is no number.
+    int getThreadCount(Settings* settings) const;
 
     // The stored search over `input`: the most recent text and folders, the
     // filter and the options. A value counts only when it is stored and Qt
@@ -55,6 +60,7 @@ public:
     QString whereKey;
     QString filterKey;
     QString includeSubFolderKey;
+    QString threadCountKey;
 
 private:
     QString getFirstStringOfKey(Settings* settings, const QString& keyPath) const;

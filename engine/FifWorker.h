@@ -2,6 +2,7 @@
 
 #include "FifHit.h"
 #include "FifInput.h"
+#include "FifScanPool.h"
 
 #include <QDir>
 #include <QList>
@@ -14,14 +15,16 @@ class QFileInfo;
 namespace Gui {
 namespace Orba {
 
-class FifFileDevice;
 class FifJob;
-class FifLineScanner;
+class FifNameFilter;
 
-// Walks the folders of a job's request depth-first and scans every text file
-// in it. Lives on the job's thread for one run; reaches the job only through
-// its locked operations and the three signals, which Qt delivers queued.
-class FifWorker : public QObject
+// Walks the folders of a job's request depth-first and has every text file
+// in it scanned, by a pool of scanning threads or (with one thread, or when
+// run in the job's own thread) by the walking thread itself. Lives on the
+// job's thread for one run; reaches the job only through its locked
+// operations and the three signals, which carry the search's events, in
+// walk order, to the job's outbox.
+class FifWorker : public QObject, private FifScanPool::Receiver
 {
     Q_OBJECT
 
@@ -42,27 +45,26 @@ signals:
     void found(const Gui::Orba::FifHitList& hits);
 
 protected:
-    virtual void searchFile(const QString& path);
+    // Walks one folder that the request names.
     virtual void searchFolder(const QDir& folder);
 
 private:
     void addFolder(QDir& folder, QList<QDir>& folders);
-    void sendHit(const FifHit& hit, FifHitList& batch);
-    // Opens the entry and tests it; a text file stays open for the
-    // searchFile() that follows, so that it is opened only once.
-    bool openTextFile(const QFileInfo& info);
-    static bool isTextFile(FifFileDevice& file);
-    // The test through a QTextStream, for files of a UTF-16 or UTF-32
-    // byte-order mark.
-    static bool isTextByStream(const QString& path);
+    bool shouldStop() const;
+    // The pool's reports, in walk order: the counters are raised and the
+    // signals emitted here, batching the hits.
+    void fileStarted(const QString& path) override;
+    void hitFound(const FifHit& hit) override;
+    void fileEnded(bool hasHit) override;
+    void sendBatch();
 
     FifJob* job;
     FifInput input;
-    // Built once for the whole search.
-    std::unique_ptr<FifLineScanner> scanner;
-    std::unique_ptr<FifFileDevice> openedFile;
-    QString openedPath;
-    QByteArray headBuffer;  // lent to each file opened in turn
+    std::unique_ptr<FifNameFilter> filter;
+    // The run's pool, while searchFolders() runs.
+    std::unique_ptr<FifScanPool> pool;
+    // Hits of the file being reported that wait to go as one batch.
+    FifHitList batch;
 };
 
 } // namespace Orba

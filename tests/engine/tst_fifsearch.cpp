@@ -3,6 +3,8 @@
 // stopping and restarting; jobs, managers and windows coming and going.
 
 #include "FifManager.h"
+#include "FifScanPool.h"
+#include "FifSettings.h"
 #include "FifReference.h"
 #include "FifTest.h"
 #include "FifWorker.h"
@@ -12,6 +14,7 @@
 #include <QtTest>
 
 #include <atomic>
+#include <fcntl.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/un.h>
@@ -21,18 +24,30 @@ using namespace Gui::Orba;
 
 namespace {
 
-// The files a search reads, by its rules: depth-first in listing order, links
-// and all but regular files passed over, file patterns without case.
+// The files a search reads, by the rules of QDir's listing: depth-first in
+// listing order, links and all but regular files passed over, file patterns
+// without case; patterns after "!" leave out files and folders.
 void walk(const QString& folder, const FifInput& in, QStringList* files)
 {
-    const QStringList patterns = in.filter.split(';', Qt::SkipEmptyParts);
-    const QDir dir(folder, QString(), QDir::NoSort, QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot);
+    QStringList patterns, exclusions;
+    for (const QString& pattern : in.filter.split(';', Qt::SkipEmptyParts))
+        (pattern.startsWith('!') ? exclusions : patterns) << pattern.mid(pattern.startsWith('!') ? 1 : 0);
+    QDir dir(folder, QString(), QDir::NoSort, QDir::Files | QDir::NoSymLinks | QDir::Hidden | QDir::AllDirs | QDir::NoDotAndDotDot);
+    dir.setNameFilters(patterns);
     for (const QFileInfo& entry : dir.entryInfoList()) {
-        if (!entry.isSymLink() && entry.isFile() && (patterns.isEmpty() || QDir::match(patterns, entry.fileName())))
+        if (!exclusions.isEmpty() && QDir::match(exclusions, entry.fileName()))
+            continue;
+        if (entry.isFile())
             files->append(entry.filePath());
-        if (!entry.isSymLink() && entry.isDir() && in.includeSubFolders)
+        else if (in.includeSubFolders)
             walk(entry.filePath(), in, files);
     }
+}
+
+QString hitLine(const QString& file, int line, const QString& text, int offset, int rawOffset)
+{
+    return QStringLiteral("%1 (%2): %3 @%4/%5|%3").arg(QDir::toNativeSeparators(file), QString::number(line), text,
+                                                       QString::number(offset), QString::number(rawOffset));
 }
 
 // "searching <file>" for every text file, then one line per hit as shown.
@@ -47,8 +62,7 @@ QStringList expected(const FifInput& in)
             continue;
         events << "searching " + path;
         for (const FifReference::Match& m : FifReference::matches(file.readAll(), in.getRegExp()))
-            events << QStringLiteral("%1 (%2): %3 @%4/%5|%3").arg(QDir::toNativeSeparators(path),
-                          QString::number(m.line), m.text, QString::number(m.offset), QString::number(m.rawOffset));
+            events << hitLine(path, m.line, m.text, m.offset, m.rawOffset);
     }
     return events;
 }
@@ -65,6 +79,24 @@ QStringList snapshot(const QString& root)
                      + QString::number(file.size()) + (small ? file.readAll().toHex() : QByteArray());
     }
     return state;
+}
+
+// Notes what the GUI thread learns of a job's search, as expected() has it;
+// batches start at 10 rows and hold one file's hits.
+void record(FifJob* job, QStringList* events, QSet<QString>* hitFiles)
+{
+    FifHitsModel* model = job->getHitsModel();
+    QObject::connect(job, &FifJob::searching, model, [=](const QString& file) { *events << "searching " + file; });
+    QObject::connect(model, &QAbstractItemModel::rowsInserted, model, [=](const QModelIndex&, int first, int last) {
+        QVERIFY2(first == last || first >= 10, "singles while the model has fewer than 10 rows");
+        for (int row = first; row <= last; ++row) {
+            const FifHit hit = model->index(row).data(Qt::UserRole).value<FifHit>();
+            QCOMPARE(hit.file, model->index(first).data(Qt::UserRole).value<FifHit>().file);
+            *hitFiles << hit.file;
+            *events << model->index(row).data().toString() + QStringLiteral(" @%1/%2|").arg(hit.offset)
+                               .arg(hit.rawOffset) + model->index(row).data(Qt::ToolTipRole).toString();
+        }
+    });
 }
 
 struct FolderRecorder : FifWorker {  // walks nothing: notes the folders that a request names
@@ -110,6 +142,12 @@ private slots:
         // Hostile: deep nesting, links and their loops, a FIFO, a socket, sparse files.
         QVERIFY(FifTest::write(ref, QString("n/").repeated(300) + "deep.txt", "x\nthe needle\n"));
         QVERIFY(FifTest::write(root, "outside/secret.txt", "needle\n"));
+        const QByteArray native = QFile::encodeName(ref);  // names that are not UTF-8: a file, a folder
+        QVERIFY(::mkdir(native + "/odd\xfe", 0700) == 0);
+        for (const QByteArray& name : {native + "/bad\xff.txt", native + "/odd\xfe/x.txt"}) {
+            const int fd = ::open(name.constData(), O_WRONLY | O_CREAT, 0600);
+            QVERIFY(fd >= 0 && ::write(fd, "needle\n", 7) == 7 && ::close(fd) == 0);
+        }
         for (const auto& [target, link] : {std::pair<QString, QString>(ref, "sub/link-up"), {"..", "sub/link-parent"},
                                            {ref + "/link-x", "link-y"}, {ref + "/link-y", "link-x"},
                                            {ref + "/link-self.txt", "link-self.txt"}, {root + "/outside", "link-out"},
@@ -137,41 +175,43 @@ private slots:
     {
         using FifTest::request;
         QTest::addColumn<FifInput>("in");
-        QTest::newRow("literal") << request("needle", ref);
-        QTest::newRow("literal, case, word") << request("Needle", ref, QRegExp::FixedString, true, true);
-        QTest::newRow("wildcard, word") << request("ne?d*e", ref, QRegExp::Wildcard, false, true);
-        QTest::newRow("regexp, case") << request("^\\s*n[a-z]+dle|%1", ref, QRegExp::RegExp2, true);
-        QTest::newRow("every line, two folders") << request("*", ref + "/sub;" + ref + "/enc", QRegExp::Wildcard);
+        QTest::addColumn<int>("threads");
+        QTest::newRow("literal, 1 thread") << request("needle", ref) << 1;
+        QTest::newRow("literal, 3 threads") << request("needle", ref) << 3;
+        QTest::newRow("literal, case, word") << request("Needle", ref, QRegExp::FixedString, true, true) << 2;
+        QTest::newRow("wildcard, word") << request("ne?d*e", ref, QRegExp::Wildcard, false, true) << 3;
+        QTest::newRow("regexp, case") << request("^\\s*n[a-z]+dle|%1", ref, QRegExp::RegExp2, true) << 2;
+        QTest::newRow("every line, two folders") << request("*", ref + "/sub;" + ref + "/enc", QRegExp::Wildcard) << 3;
         FifInput in = request("needle", ref);
         in.filter = "*.TXT;*.c;-*";
         in.includeSubFolders = false;
-        QTest::newRow("patterns, no subfolders") << in;
+        QTest::newRow("patterns, no subfolders") << in << 1;
         in.filter.clear();
-        QTest::newRow("no patterns, no subfolders") << in;
+        QTest::newRow("no patterns, no subfolders") << in << 3;
+        in.includeSubFolders = true;
+        in.filter = "!SUB;*.txt;!.h*;!-*;*.C;!N";
+        QTest::newRow("exclusions") << in << 3;
+        in.filter = "!n;!*.TXT;!sub;!.hid";
+        QTest::newRow("exclusions only") << in << 2;
+        in.where = ref + "/sub", in.filter = "!sub;!deeper";
+        QTest::newRow("excluded folder named") << in << 2;
     }
 
     // What the GUI thread learns, in its order, is what a plain reading of
-    // the tree gives; batches start at 10 rows and hold one file's hits.
+    // the tree gives, whatever the number of threads.
     void reference()
     {
         QFETCH(FifInput, in);
         FifManager manager;
         FifJob* job = manager.getJob(0);
+        QFETCH(int, threads);
+        job->setThreadCount(threads);
+        QCOMPARE(job->getThreadCount(), threads);
         FifHitsModel* model = job->getHitsModel();
         FifTest::watch(model);
         QStringList events;
         QSet<QString> hitFiles;
-        connect(job, &FifJob::searching, this, [&](const QString& file) { events << "searching " + file; });
-        connect(model, &QAbstractItemModel::rowsInserted, this, [&](const QModelIndex&, int first, int last) {
-            QVERIFY2(first == last || first >= 10, "singles while the model has fewer than 10 rows");
-            for (int row = first; row <= last; ++row) {
-                const FifHit hit = model->index(row).data(Qt::UserRole).value<FifHit>();
-                QCOMPARE(hit.file, model->index(first).data(Qt::UserRole).value<FifHit>().file);
-                hitFiles << hit.file;
-                events << model->index(row).data().toString() + QStringLiteral(" @%1/%2|").arg(hit.offset)
-                                  .arg(hit.rawOffset) + model->index(row).data(Qt::ToolTipRole).toString();
-            }
-        });
+        record(job, &events, &hitFiles);
         QVERIFY(FifTest::run(job, in));
         const QStringList want = expected(in);
         QCOMPARE(events, want);
@@ -180,12 +220,75 @@ private slots:
                 && job->getLineHitCount() == want.size() - files);
         QCOMPARE(model->headerData(0, Qt::Horizontal).toString(),
                  want.size() > files ? in.toString() : QStringLiteral("No Search Results"));
-        // The tree does its part: no link read; the deep file and the text
-        // test's 20 lines through the worker.
-        QVERIFY(events.filter(QRegularExpression("link|secret")).isEmpty());
-        if (in.what == "needle" && in.includeSubFolders)
+        // The tree does its part: no link read, no name that is not UTF-8; the
+        // deep file and the text test's 20 lines through the worker; folders
+        // left out by name not entered, unless named by the request.
+        QVERIFY(events.filter(QRegularExpression("link|secret|\\x{FFFD}")).isEmpty());
+        if (in.what == "needle" && in.filter == "*")
             QVERIFY(events.filter("deep.txt (2)").size() == 1 && events.contains("searching " + ref + "/enc/u16-21.txt")
                     && !events.contains("searching " + ref + "/enc/u16-20.txt") && want.size() - files > 300);
+        if (in.filter.contains('!'))
+            QVERIFY(files > 3 && events.filter(QRegularExpression(in.where == ref ? "/sub/|/n/|/\\.hid" : "/deeper/")).isEmpty());
+    }
+
+    // Tiny bounds keep the scanning threads waiting at every turn, for room
+    // and for the head; what they report stays in walk order.
+    void poolOrder()
+    {
+        struct Recorder : FifScanPool::Receiver {
+            QStringList events;
+            int hitFiles = 0;
+            void fileStarted(const QString& path) override { events << "searching " + path; }
+            void hitFound(const FifHit& h) override { events << hitLine(h.file, h.line, h.text, h.offset, h.rawOffset); }
+            void fileEnded(bool hasHit) override { hitFiles += hasHit; }
+        } recorder;
+        const FifInput in = FifTest::request("needle", ref);
+        QStringList files;
+        walk(ref, in, &files);
+        {
+            FifScanPool pool(nullptr, in.getRegExp(), 4, recorder, FifScanPool::Limits{1, 2, 64});
+            for (const QString& file : qAsConst(files))
+                QVERIFY(pool.add(file));
+            pool.finish();
+        }
+        const QStringList want = expected(in);
+        QCOMPARE(recorder.events, want);
+        QSet<QString> hitFiles;
+        for (const QString& line : want.filter(QRegularExpression("^/")))
+            hitFiles << line.section(" (", 0, 0);
+        QCOMPARE(recorder.hitFiles, hitFiles.size());
+    }
+
+    // Stopped anywhere, a search on several threads has delivered a prefix
+    // of what the whole search does, with the counters of that prefix. The
+    // search ends in a file where it would take minutes, so the stop cuts.
+    void stopPrefix_data()
+    {
+        QTest::addColumn<int>("rows");
+        for (int rows : {0, 1, 9, 10, 150, INT_MAX})
+            QTest::addRow("after %d rows", rows) << rows;
+    }
+
+    void stopPrefix()
+    {
+        QFETCH(int, rows);
+        const QString pattern = "needle|(a|aa)*b", stuck = "searching " + slow + "/line.txt";
+        FifManager manager;
+        FifJob* job = manager.getJob(0);
+        job->setThreadCount(3);
+        FifTest::watch(job->getHitsModel());
+        QStringList events;
+        QSet<QString> hitFiles;
+        record(job, &events, &hitFiles);
+        const auto stopper = [&] { if (job->getLineHitCount() >= rows || events.last() == stuck) job->stop(); };
+        connect(job, &FifJob::searching, this, stopper);
+        connect(job->getHitsModel(), &QAbstractItemModel::rowsInserted, this, stopper);
+        QVERIFY(FifTest::run(job, FifTest::request(pattern, ref + ';' + slow, QRegExp::RegExp2)));
+        const QStringList all = expected(FifTest::request(pattern, ref, QRegExp::RegExp2)) << stuck;
+        QVERIFY2(events == all.mid(0, events.size()), qPrintable(events.join('\n')));
+        const int files = events.filter(QRegularExpression("^searching /")).size();
+        QVERIFY(job->getReadFileCount() == files && job->getFileHitCount() == hitFiles.size()
+                && job->getLineHitCount() == events.size() - files && job->getLineHitCount() >= qMin(rows, 300));
     }
 
     // A job's life: stopped before its start and during a file (while the
@@ -195,6 +298,8 @@ private slots:
         auto manager = std::make_unique<FifManager>();
         const FifInput all = FifTest::request("x", big), stuck = FifTest::request("(a|aa)*b", slow, QRegExp::RegExp2);
         FifJob* job = manager->getJob(0);
+        job->setThreadCount(3);
+        manager->getJob(1)->setThreadCount(2);
         FifHitsModel* model = job->getHitsModel();
         FifTest::watch(model);
         job->stop();  // asked for before the start: the run ends at its first poll, the stop is cleared
@@ -257,6 +362,13 @@ private slots:
         // Slots grow one at a time; a job gone from its slot is replaced.
         FifJob* zero = manager->getJob(3);
         QVERIFY(!manager->getJob(-1) && manager->getJob(0) == zero && manager->getJobCount() == 1);
+        zero->setThreadCount(-1);  // 0 or less: one per core, also when the settings name no number
+        QCOMPARE(zero->getThreadCount(), qMax(1, QThread::idealThreadCount()));
+        Settings store;
+        store.setValue("Find-In-Files/ThreadCount", "three");
+        QCOMPARE(FifSettings().getThreadCount(&store) + FifSettings().getThreadCount(nullptr), 0);
+        store.setValue(FifSettings().getThreadCountKeyPath(), 3);
+        QCOMPARE(FifSettings().getThreadCount(&store), 3);
         FifJob* one = manager->getJob(1);
         auto* mine = new FifJob(manager);
         QVERIFY(!manager->replaceJob(0, mine) && manager->replaceJob(1, mine) == one && manager->getJob(1) == mine);
