@@ -143,7 +143,8 @@ private:
 FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint64 block)
     : rx(expression)
     , prefilter(expression)
-    , usePrefilter(prefilter.isActive())
+    , asciiMatcher(expression)
+    , usePrefilter(prefilter.isActive() || asciiMatcher.isActive())
     , maxLineBytes(qMax<qint64>(maxBytes, 1))
     , blockSize(qMax<qint64>(block, 1))
 {
@@ -222,10 +223,30 @@ bool FifLineScanner::readBlocks(QIODevice& device, Take take)
     }
 }
 
-void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars)
+bool FifLineScanner::sift(const QByteArray& bytes, int* column) const
+{
+    const char* begin = bytes.constData();
+    const char* end = begin + bytes.size();
+    FifPrefilter::Cursor cursor;
+    const char* found = prefilter.find(begin, end, cursor);
+    if (prefilter.isActive() && found == end)
+        return false;
+    if (prefilter.isExact() && FifAsciiMatcher::isAscii(begin, bytes.size())) {
+        *column = int(found - begin);
+        return true;
+    }
+    return asciiMatcher.match(begin, bytes.size()) != FifAsciiMatcher::NoMatch;
+}
+
+void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars,
+                               int knownColumn)
 {
     int length = 0;
-    const int position = indexIn(text, &length);
+    int position = knownColumn;
+    if (knownColumn >= 0)
+        length = int(prefilter.getNeedle().size());
+    else
+        position = indexIn(text, &length);
     if (position >= 0) {
         hasHit = true;
         (*sink)(Match{clampToInt(lineNumber), clampToInt(offset + position),
@@ -276,10 +297,8 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
     auto finishLine = [&](bool newline) {
         const int terminator = line.end(newline);
         const QByteArray& bytes = line.keptBytes();
-        const char* end = bytes.constData() + bytes.size();
-        FifPrefilter::Cursor cursor;
-        if (usePrefilter && !line.isOverlong()
-            && prefilter.find(bytes.constData(), end, cursor) == end) {
+        int column = -1;
+        if (usePrefilter && !line.isOverlong() && !sift(bytes, &column)) {
             // Only a line after it needs its length.
             if (newline) {
                 settle();
@@ -289,7 +308,7 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
         } else {
             settle();
             const qint64 rest = line.countRest();
-            matchLine(decoder.decode(bytes), terminator, rest);
+            matchLine(decoder.decode(bytes), terminator, rest, column);
         }
         line.clear();
         return !stopped;
