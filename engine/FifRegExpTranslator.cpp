@@ -31,11 +31,44 @@ void writeByte(int c, QByteArray& out)
     out += "\\x{" + QByteArray::number(c, 16) + '}';
 }
 
+// Whether a character beyond ASCII occurs in `p`, as itself or written as
+// \xhhhh or \0ooo.
+bool namesNonAscii(const QString& p)
+{
+    for (qsizetype j = 0; j < p.size(); ++j) {
+        if (p.at(j).unicode() >= 0x80)
+            return true;
+        if (p.at(j) != QLatin1Char('\\') || j + 1 >= p.size())
+            continue;
+        ++j;
+        const bool hex = p.at(j) == QLatin1Char('x');
+        if (!hex && p.at(j) != QLatin1Char('0'))
+            continue;
+        uint value = 0;
+        for (int n = 0; n < (hex ? 4 : 3) && j + 1 < p.size(); ++n) {
+            const QChar d = p.at(j + 1);
+            if (hex ? !isHexDigit(d) : !(d >= QLatin1Char('0') && d <= QLatin1Char('7')))
+                break;
+            const char16_t c = d.unicode();
+            value = value * (hex ? 16 : 8) + (isAsciiDigit(d) ? c - '0' : (c | 0x20) - 'a' + 10);
+            ++j;
+        }
+        if (value >= 0x80)
+            return true;
+    }
+    return false;
+}
+
 } // namespace
 
 QByteArray FifRegExpTranslator::toPcre(const QRegExp& rx)
 {
     if (!rx.isValid() || rx.patternSyntax() != QRegExp::RegExp2)
+        return QByteArray();
+    // Without case QRegExp equates some characters beyond ASCII with ASCII
+    // letters in some places of an expression and not in others ("ſ"
+    // finds "s", "ſ+" does not): such expressions are left to it.
+    if (rx.caseSensitivity() == Qt::CaseInsensitive && namesNonAscii(rx.pattern()))
         return QByteArray();
     FifRegExpTranslator translator(rx);
     QByteArray out;
@@ -89,10 +122,18 @@ bool FifRegExpTranslator::item(QByteArray& out, int depth, bool* done)
         } else {
             out += "(?:";  // nothing refers to the capture
         }
+        const bool lookahead = !quantifiable;
+        lookaheads += lookahead ? 1 : 0;
         if (!alternatives(out, depth + 1) || i >= p.size() || p.at(i) != QLatin1Char(')'))
             return false;
+        lookaheads -= lookahead ? 1 : 0;
         out += ')';
         ++i;
+    } else if (lookaheads > 0 && (c == QLatin1Char('^') || c == QLatin1Char('$')
+                                  || p.mid(i, 2).compare(QLatin1String("\\b"), Qt::CaseInsensitive) == 0)) {
+        // QRegExp tests \b and \B wrongly inside a look-ahead ("a(?!\B)"
+        // matches "ab"); the anchors there are left to it as well.
+        return false;
     } else if (c == QLatin1Char('^') || c == QLatin1Char('$')) {
         // QRegExp reads them as anchors wherever they stand; lines hold
         // no line break, so the start and the very end are all they mean.

@@ -16,22 +16,25 @@ namespace Orba {
 //
 // Only the plainest part of the RegExp2 syntax is taken, where both engines
 // ask the same of a line: characters, escapes and classes, ".", groups
-// (capturing, "(?:", and the look-aheads "(?=" and "(?!"), alternatives, the
-// quantifiers * + ? and {n,m} on characters and groups, the anchors ^ and $
-// and the word boundaries \b and \B. Whether a match exists does not depend
-// on which of several matches an engine prefers, so greedy or not does not
-// matter here. Anything else (back references, a class holding "[" or
+// (capturing, "(?:", and the look-aheads "(?=" and "(?!"), alternatives,
+// the quantifiers * + ? and {n,m} on characters and groups, the anchors ^
+// and $ and the word boundaries \b and \B (not inside a look-ahead, where
+// QRegExp does not test them as it does outside). Whether a match exists
+// does not depend on which of several matches an engine prefers, so greedy
+// or not does not matter here. Without case, the expression must name
+// ASCII characters only: QRegExp folds the others differently from place
+// to place. Anything else (back references, a class holding "[" or
 // starting with "]", an escaped letter QRegExp reads as itself, nested
 // quantifiers) makes the translation give up.
 //
 // What each character item matches is not worked out from the syntax but
 // asked of QRegExp itself, item by item, for each of the 128 ASCII
 // characters, with the expression's own case sensitivity; the item becomes
-// that set. So case folding (the Kelvin sign matching "k"), \w, \s, \d,
-// ranges, negation and QRegExp's own escapes (\0ooo, \xhhhh) mean in the
-// result exactly what they mean to QRegExp on such lines. The result is
-// compiled without options: no "." nor ^ $ of PCRE2's whose meaning depends
-// on them is used (\A and \z stand for ^ and $).
+// that set. So case folding, \w, \s, \d, ranges, negation and QRegExp's
+// own escapes (\0ooo, \xhhhh) mean in the result exactly what they mean to
+// QRegExp on such lines. The result is compiled without options: no "."
+// nor ^ $ of PCRE2's whose meaning depends on them is used (\A and \z
+// stand for ^ and $).
 class FifRegExpTranslator
 {
 public:
@@ -57,6 +60,7 @@ private:
     const QString p;
     const Qt::CaseSensitivity cs;
     qsizetype i = 0;
+    int lookaheads = 0;  // look-aheads around the item read
     QHash<QString, AsciiSet> sets;
 };
 

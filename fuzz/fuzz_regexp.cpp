@@ -11,6 +11,13 @@
 
 #include <QBuffer>
 
+#if defined(__has_feature) && __has_feature(address_sanitizer)
+#include <sanitizer/lsan_interface.h>
+#define FIF_IGNORE_LEAKS __lsan::ScopedDisabler qtLeaks
+#else
+#define FIF_IGNORE_LEAKS
+#endif
+
 #include <cstdio>
 #include <cstdlib>
 
@@ -41,18 +48,18 @@ QString expression(Bytes& in, int depth)
                                            "\t", "\r", "\\r", "\\t", "\\x41", "\\x006b", "\\x212A", "\\0101", "\\\\",
                                            "\\d", "\\D", "\\s", "\\S", "\\w", "\\W", "[a-c]", "[^a-c]", "[k]", "[^\\w]",
                                            "[\\d_]", "[R-T]", "[^é]", "[\\x212a]", "[K-k]", "é", "\u212A", "\u017F",
-                                           "\u0130", "\u0131", "ß", "\\1", "[[:alpha:]]", "\\q", "[]a]"};
+                                           "\u0130", "\u0131", "ß", "\\1", "\\q", "[]a]"};
     static const QStringList opening = {"(", "(?:", "(?=", "(?!"}, anchors = {"^", "$", "\\b", "\\B"},
-                             quantifiers = {"*", "+", "?", "{2}", "{1,3}", "{,2}", "{2,}", "{0}", "{1}?"};
+                             quantifiers = {"*", "+", "?", "{2}", "{1,3}", "{,2}", "{2,}", "{0}"};
     QString out;
     for (int items = 1 + in.next(6); items > 0 && in.more(); --items) {
         const int kind = in.next(12);
         QString item = kind < 7 ? characters.at(in.next(characters.size())) : anchors.at(in.next(anchors.size()));
         if (kind == 9 && depth < 4)
             item = opening.at(in.next(opening.size())) + expression(in, depth + 1) + ")";
-        else if (kind == 10)
+        if (kind == 10)
             item = "|";
-        if (in.next(3) == 0)
+        else if (in.next(3) == 0)
             item += quantifiers.at(in.next(quantifiers.size()));
         out += item;
     }
@@ -72,9 +79,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
     request.matchWord = data[0] & 2;
     request.matchType = (data[0] >> 2) % 4 == 3 ? QRegExp::Wildcard : (data[0] >> 2) % 4 == 2 ? QRegExp::FixedString
                                                                                               : QRegExp::RegExp2;
+    {
+        // Qt's QRegExp leaks parts of its engine when it rejects some expressions ("(?!${21", "a(?=b)c{2}{0}").
+        FIF_IGNORE_LEAKS;
+        if (!request.isValid())
+            return 0;
+    }
     const QRegExp rx = request.getRegExp();
-    if (!request.isValid())
-        return 0;
 
     static const QList<QByteArray> pieces = {"a", "b", "k", "K", "s", "S", "i", "I", "_", "0", "7", " ", "-", ".",
                                              "\t", "\r", "ab", "\\", "\xc3\xa9", "\xe2\x84\xaa", "\xc5\xbf",
