@@ -40,11 +40,11 @@ FifGrepColors FifGrepColors::fromGrepColors(const QByteArray& grepColors)
     return colors;
 }
 
-void FifGrepColors::append(QByteArray& out, Part part, const char* text, qsizetype size) const
+void FifGrepColors::appendColored(QByteArray& out, Part part, const char* text, qsizetype size) const
 {
     const QByteArray& parameters = sgr[part];
-    if (!enabled || parameters.isEmpty()) {
-        out.append(text, size);
+    if (parameters.isEmpty()) {
+        appendPlain(out, text, size);
         return;
     }
     out += "\33[" + parameters + 'm';

@@ -2,6 +2,8 @@
 
 #include <QByteArray>
 
+#include <cstring>
+
 namespace Gui {
 namespace Orba {
 
@@ -25,13 +27,30 @@ public:
 
     bool isEnabled() const { return enabled; }
     // Appends `text` to `out`, in the part's colour if it has one.
-    void append(QByteArray& out, Part part, const char* text, qsizetype size) const;
+    void append(QByteArray& out, Part part, const char* text, qsizetype size) const
+    {
+        if (enabled)
+            appendColored(out, part, text, size);
+        else
+            appendPlain(out, text, size);
+    }
     void append(QByteArray& out, Part part, const QByteArray& text) const
     {
         append(out, part, text.constData(), text.size());
     }
 
+    // Appends without QByteArray's general insertion, for a line's many
+    // short pieces.
+    static void appendPlain(QByteArray& out, const char* text, qsizetype size)
+    {
+        const qsizetype at = out.size();
+        out.resize(at + size);
+        std::memcpy(out.data() + at, text, size_t(size));
+    }
+
 private:
+    void appendColored(QByteArray& out, Part part, const char* text, qsizetype size) const;
+
     bool enabled = false;
     bool eraseLine = true;
     QByteArray sgr[PartCount];

@@ -53,6 +53,7 @@ void FifHitPrinter::printReadyRows()
         return;
     const int rows = model->rowCount();
     output.resize(0);
+    output.reserve(64 * 1024);
     for (; nextRow < rows; ++nextRow)
         append(model->at(nextRow));
     if (output.isEmpty())
@@ -80,30 +81,42 @@ void FifHitPrinter::append(const FifHit& hit)
     }
     colors.append(output, FifGrepColors::FileName, fileName);
     colors.append(output, FifGrepColors::Separator, " (", 2);
-    char number[16];
-    const int digits = std::snprintf(number, sizeof number, "%d", hit.line);
-    colors.append(output, FifGrepColors::LineNumber, number, digits);
+    // As QString::number() writes it.
+    char number[12];
+    char* digits = number + sizeof number;
+    unsigned magnitude = hit.line < 0 ? 0u - unsigned(hit.line) : unsigned(hit.line);
+    do {
+        *--digits = char('0' + magnitude % 10);
+        magnitude /= 10;
+    } while (magnitude);
+    if (hit.line < 0)
+        *--digits = '-';
+    colors.append(output, FifGrepColors::LineNumber, digits, number + sizeof number - digits);
     colors.append(output, FifGrepColors::Separator, "): ", 3);
-    const QString& text = hit.text;
+    const QStringView text(hit.text);
     if (colors.isEnabled() && hit.column >= 0 && hit.length > 0 && hit.column + hit.length <= text.size()) {
-        output += QStringView(text).left(hit.column).toUtf8();
-        colors.append(output, FifGrepColors::Match, QStringView(text).mid(hit.column, hit.length).toUtf8());
-        output += QStringView(text).mid(hit.column + hit.length).toUtf8();
+        appendText(text.left(hit.column));
+        colors.append(output, FifGrepColors::Match, text.mid(hit.column, hit.length).toUtf8());
+        appendText(text.mid(hit.column + hit.length));
     } else {
-        // Most lines are ASCII: their bytes are their characters.
-        const qsizetype start = output.size();
-        output.resize(start + text.size());
-        char* out = output.data() + start;
-        for (const QChar c : text) {
-            if (c.unicode() >= 0x80) {
-                output.resize(start);
-                output += text.toUtf8();
-                break;
-            }
-            *out++ = char(c.unicode());
-        }
+        appendText(text);
     }
-    output += '\n';
+    FifGrepColors::appendPlain(output, "\n", 1);
+}
+
+void FifHitPrinter::appendText(QStringView text)
+{
+    if (!QtPrivate::isAscii(text)) {
+        output += text.toUtf8();
+        return;
+    }
+    // Most lines are ASCII: their bytes are their characters.
+    const qsizetype at = output.size();
+    output.resize(at + text.size());
+    char* out = output.data() + at;
+    const char16_t* in = text.utf16();
+    for (qsizetype i = 0; i < text.size(); ++i)
+        out[i] = char(in[i]);
 }
 
 void FifHitPrinter::dropPrintedRows()

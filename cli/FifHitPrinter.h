@@ -43,6 +43,8 @@ signals:
 private:
     void printReadyRows();
     void append(const FifHit& hit);
+    // The UTF-8 of `text`, as QString::toUtf8() gives it.
+    void appendText(QStringView text);
     void dropPrintedRows();
     void checkReader();
     void writeFailed(int error);
