@@ -31,11 +31,6 @@ FifHit::FifHit(const QString& fileName, int lineNumber, const QString& lineText,
 {
 }
 
-bool FifHit::isValid() const
-{
-    return line >= 0 && !job.isNull();
-}
-
 QString FifHit::toString() const
 {
     if (!isValid())

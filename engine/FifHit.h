@@ -29,7 +29,7 @@ public:
     ~FifHit() = default;
 
     // A line number of 0 or more, and the job that found it still exists.
-    bool isValid() const;
+    bool isValid() const { return line >= 0 && !job.isNull(); }
     // "file (line): text" with native separators; empty for an invalid hit.
     QString toString() const;
     // The file's absolute canonical path, relative paths taken from the job's

@@ -223,19 +223,19 @@ bool FifLineScanner::readBlocks(QIODevice& device, Take take)
     }
 }
 
-bool FifLineScanner::sift(const QByteArray& bytes, int* column) const
+bool FifLineScanner::sift(const char* begin, const char* end, const char* from, int* column) const
 {
-    const char* begin = bytes.constData();
-    const char* end = begin + bytes.size();
-    FifPrefilter::Cursor cursor;
-    const char* found = prefilter.find(begin, end, cursor);
-    if (prefilter.isActive() && found == end)
-        return false;
-    if (prefilter.isExact() && FifAsciiMatcher::isAscii(begin, bytes.size())) {
-        *column = int(found - begin);
-        return true;
+    if (prefilter.isActive()) {
+        FifPrefilter::Cursor cursor;
+        const char* found = prefilter.find(from, end, cursor);
+        if (found == end)
+            return false;
+        if (prefilter.isExact() && FifAsciiMatcher::isAscii(begin, end - begin)) {
+            *column = int(found - begin);
+            return true;
+        }
     }
-    return asciiMatcher.match(begin, bytes.size()) != FifAsciiMatcher::NoMatch;
+    return asciiMatcher.match(begin, end - begin) != FifAsciiMatcher::NoMatch;
 }
 
 void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars,
@@ -298,7 +298,8 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
         const int terminator = line.end(newline);
         const QByteArray& bytes = line.keptBytes();
         int column = -1;
-        if (usePrefilter && !line.isOverlong() && !sift(bytes, &column)) {
+        if (usePrefilter && !line.isOverlong()
+            && !sift(bytes.constData(), bytes.constData() + bytes.size(), bytes.constData(), &column)) {
             // Only a line after it needs its length.
             if (newline) {
                 settle();
@@ -311,6 +312,20 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
             matchLine(decoder.decode(bytes), terminator, rest, column);
         }
         line.clear();
+        return !stopped;
+    };
+
+    // The same for a line that lies whole in the buffer, ended by "\n"
+    // and kept whole: sifted and decoded where it lies. No match starts
+    // before `candidate`.
+    auto finishWholeLine = [&](const char* lineStart, const char* newline, const char* candidate) {
+        const bool crlf = newline > lineStart && newline[-1] == '\r';
+        const char* end = newline - (crlf ? 1 : 0);
+        int column = -1;
+        if (usePrefilter && !sift(lineStart, end, qMin(candidate, end), &column))
+            advance(FifLineCounter::utf16Length(lineStart, end - lineStart, decoder), crlf ? 2 : 1);
+        else
+            matchLine(decoder.decode(QByteArrayView(lineStart, end - lineStart)), crlf ? 2 : 1, 0, column);
         return !stopped;
     };
 
@@ -332,9 +347,14 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
             pollDue = passOver(begin, lineStart) || pollDue;
             if ((pollDue || lineNumber % pollInterval == 0) && stopRequested())
                 return false;
-            line.add(lineStart, newline - lineStart);
-            if (!finishLine(true))
-                return false;
+            if (newline - lineStart <= maxLineBytes) {
+                if (!finishWholeLine(lineStart, newline, candidate))
+                    return false;
+            } else {
+                line.add(lineStart, newline - lineStart);
+                if (!finishLine(true))
+                    return false;
+            }
             begin = newline + 1;
         }
         uncountedFrom = begin;
