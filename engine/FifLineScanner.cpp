@@ -223,19 +223,22 @@ bool FifLineScanner::readBlocks(QIODevice& device, Take take)
     }
 }
 
-bool FifLineScanner::sift(const char* begin, const char* end, const char* from, int* column) const
+FifLineScanner::Sifted FifLineScanner::sift(const char* begin, const char* end, const char* from,
+                                            int* column) const
 {
     if (prefilter.isActive()) {
         FifPrefilter::Cursor cursor;
         const char* found = prefilter.find(from, end, cursor);
         if (found == end)
-            return false;
+            return CannotMatch;
         if (prefilter.isExact() && FifAsciiMatcher::isAscii(begin, end - begin)) {
             *column = int(found - begin);
-            return true;
+            return MayMatch;
         }
     }
-    return asciiMatcher.match(begin, end - begin) != FifAsciiMatcher::NoMatch;
+    // PCRE2 rules out lines of ASCII characters only.
+    return asciiMatcher.match(begin, end - begin) == FifAsciiMatcher::NoMatch ? CannotMatchAscii
+                                                                               : MayMatch;
 }
 
 void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars,
@@ -299,7 +302,8 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
         const QByteArray& bytes = line.keptBytes();
         int column = -1;
         if (usePrefilter && !line.isOverlong()
-            && !sift(bytes.constData(), bytes.constData() + bytes.size(), bytes.constData(), &column)) {
+            && sift(bytes.constData(), bytes.constData() + bytes.size(), bytes.constData(), &column)
+                   != MayMatch) {
             // Only a line after it needs its length.
             if (newline) {
                 settle();
@@ -322,7 +326,10 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
         const bool crlf = newline > lineStart && newline[-1] == '\r';
         const char* end = newline - (crlf ? 1 : 0);
         int column = -1;
-        if (usePrefilter && !sift(lineStart, end, qMin(candidate, end), &column))
+        const Sifted sifted = usePrefilter ? sift(lineStart, end, qMin(candidate, end), &column) : MayMatch;
+        if (sifted == CannotMatchAscii)
+            advance(end - lineStart, crlf ? 2 : 1);
+        else if (sifted == CannotMatch)
             advance(FifLineCounter::utf16Length(lineStart, end - lineStart, decoder), crlf ? 2 : 1);
         else
             matchLine(decoder.decode(QByteArrayView(lineStart, end - lineStart)), crlf ? 2 : 1, 0, column);

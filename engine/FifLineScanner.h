@@ -88,11 +88,13 @@ private:
     // without QRegExp (see sift()).
     void matchLine(const QString& text, int terminatorLength, qint64 extraChars,
                    int knownColumn = -1);
-    // Whether the UTF-8 line [begin, end) may match; false only when it
-    // cannot. No match starts before `from`. Where the prefilter's needle
-    // is the whole expression and the line is ASCII, the first place it is
-    // found is the first match: `column` is set to it.
-    bool sift(const char* begin, const char* end, const char* from, int* column) const;
+    // Whether the UTF-8 line [begin, end) may match (and, when it cannot,
+    // whether it is known to be ASCII: its length is then its size). No
+    // match starts before `from`. Where the prefilter's needle is the whole
+    // expression and the line is ASCII, the first place it is found is the
+    // first match: `column` is set to it.
+    enum Sifted { CannotMatch, CannotMatchAscii, MayMatch };
+    Sifted sift(const char* begin, const char* end, const char* from, int* column) const;
     void advance(qint64 chars, int terminatorLength);
     // The first match in `text`, as rx.indexIn() with QRegExp::CaretAtZero
     // finds it, and its length; sets `stopped` when a stop request ends the
