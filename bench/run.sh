@@ -17,7 +17,7 @@
 set -euo pipefail
 root="$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)"
 source "$root/scripts/deps.sh"
-fif_install_packages "${FIF_BUILD_PACKAGES[@]}" grep ripgrep hyperfine perl-base
+fif_install_packages "${FIF_BUILD_PACKAGES[@]}" grep ripgrep hyperfine perl-base time
 
 runs="${RUNS:-5}"
 only="${CASES:-.}"
@@ -78,6 +78,15 @@ run_case() { # tree, label, fif-args, grep-args, rg-args
   sed 's/^/    /' "$work/check"
 }
 
+# The largest resident size of fif and of grep on a search, output through a pipe.
+peak_memory() { # label, fif-args, grep-args, tree
+  [[ "$1" =~ $only ]] || return 0
+  /usr/bin/time -o "$work/fif.mem" -f %M sh -c "'$fif' $2 '$4' 2>/dev/null | cat >/dev/null"
+  /usr/bin/time -o "$work/grep.mem" -f %M sh -c "LC_ALL=C grep -r -n $3 '$4' | cat >/dev/null"
+  printf "%-28s peak resident fif %d MB, grep %d MB\n" "$1" \
+    $(( $(tail -1 "$work/fif.mem") / 1024 )) $(( $(tail -1 "$work/grep.mem") / 1024 ))
+}
+
 echo "$(lscpu | grep 'Model name' | tr -s ' '), $(nproc) cores"
 echo "fif $("$fif" --version | cut -d' ' -f2) (Release), $(grep --version | head -1), $(rg --version 2>/dev/null | head -1), $(hyperfine --version)"
 echo "median of $runs runs after a warm-up; load average now: $(cut -d' ' -f1-3 /proc/loadavg)"
@@ -105,5 +114,8 @@ for tree in "${trees[@]}"; do
     "-E -i -e 'colou?r'" "-i -e 'colou?r'" || status=1
   run_case "$tree" "wildcard http*org"       "--match-case --wildcard -- 'http*org'" \
     "-E -e 'http.*org'" "-e 'http.*org'" || status=1
+  # Millions of hits: the cost per hit, and memory that must not grow with them.
+  run_case "$tree" "many hits, e" "--match-case -- e" "-F -e e" "-F -e e" || status=1
+  peak_memory "many hits, e" "--match-case -- e" "-F -e e" "$tree"
 done
 exit $status

@@ -2,6 +2,7 @@
 
 #include <QCommandLineParser>
 #include <QObject>
+#include <QThread>
 
 namespace Gui {
 namespace Orba {
@@ -12,10 +13,15 @@ FifCommandLine::Result FifCommandLine::parse(const QStringList& arguments)
     parser.setApplicationDescription(
         tr("Searches the text files below the folders for lines matching PATTERN and "
            "prints each as \"file (line): text\"; the counts go to standard error.\n"
-           "Exit status: 0 lines found, 1 none found, 2 bad expression or arguments."));
+           "Exit status: 0 lines found, 1 none found, 2 bad expression or arguments, or a "
+           "folder that cannot be searched."));
     const QCommandLineOption filter(
         QStringLiteral("filter"),
-        tr("File-name patterns separated by \";\", matched without regard to case."),
+        tr("File-name patterns separated by \";\", matched without regard to case. A "
+           "pattern starting with \"!\" excludes the files and folders whose names match "
+           "it, and folders so excluded are not entered, e.g. "
+           "\"*.cpp;*.h;!moc_*;!build;!.git\". Exclusions alone mean every file not "
+           "excluded."),
         tr("patterns"), QStringLiteral("*"));
     const QCommandLineOption matchCase(QStringLiteral("match-case"),
                                        tr("Letter case must match."));
@@ -26,9 +32,19 @@ FifCommandLine::Result FifCommandLine::parse(const QStringList& arguments)
                                     tr("PATTERN is a regular expression."));
     const QCommandLineOption noSubFolders(QStringLiteral("no-subfolders"),
                                           tr("Do not search subfolders."));
+    const QCommandLineOption color(
+        {QStringLiteral("color"), QStringLiteral("colour")},
+        tr("Colour file names, line numbers, separators and matches as GNU grep does "
+           "(GREP_COLORS' fn, ln, se and mt are honoured): always, never, or auto, only when "
+           "standard output is a terminal (the default, also for --color alone)."),
+        tr("when"), QStringLiteral("auto"));
+    const QCommandLineOption threads({QStringLiteral("j"), QStringLiteral("threads")},
+                                     tr("Scanning threads (default: the number of cores)."),
+                                     tr("N"));
     const QCommandLineOption help(QStringLiteral("help"), tr("Show this help."));
     const QCommandLineOption version(QStringLiteral("version"), tr("Show the version."));
-    parser.addOptions({filter, matchCase, word, wildcard, regexp, noSubFolders, help, version});
+    parser.addOptions({filter, matchCase, word, wildcard, regexp, noSubFolders, color, threads,
+                       help, version});
     parser.addPositionalArgument(QStringLiteral("PATTERN"),
                                  tr("Literal text to find, unless --wildcard or --regexp."));
     parser.addPositionalArgument(
@@ -41,7 +57,13 @@ FifCommandLine::Result FifCommandLine::parse(const QStringList& arguments)
     if (!arguments.isEmpty())
         helpText.replace(QStringLiteral("Usage: ") + arguments.first(), QStringLiteral("Usage: fif"));
 
-    if (!parser.parse(arguments)) {
+    // As for grep, --color alone means auto; the parser wants a value.
+    QStringList withValues = arguments;
+    for (qsizetype i = 1; i < withValues.size() && withValues.at(i) != QLatin1String("--"); ++i) {
+        if (withValues.at(i) == QLatin1String("--color") || withValues.at(i) == QLatin1String("--colour"))
+            withValues[i] += QLatin1String("=auto");
+    }
+    if (!parser.parse(withValues)) {
         errorText = parser.errorText();
         return Error;
     }
@@ -53,6 +75,27 @@ FifCommandLine::Result FifCommandLine::parse(const QStringList& arguments)
         errorText = tr("--wildcard and --regexp exclude each other.");
         return Error;
     }
+    // grep's words for the three choices.
+    const QString when = parser.value(color);
+    if (QStringList{"always", "yes", "force"}.contains(when)) {
+        colorMode = ColorAlways;
+    } else if (QStringList{"never", "no", "none"}.contains(when)) {
+        colorMode = ColorNever;
+    } else if (QStringList{"auto", "tty", "if-tty"}.contains(when)) {
+        colorMode = ColorAuto;
+    } else {
+        errorText = tr("Invalid argument \"%1\" for --color: use always, never or auto.").arg(when);
+        return Error;
+    }
+    threadCount = 0;
+    if (parser.isSet(threads)) {
+        bool isNumber = false;
+        threadCount = parser.value(threads).toInt(&isNumber);
+        if (!isNumber || threadCount < 1) {
+            errorText = tr("Invalid number of threads: \"%1\".").arg(parser.value(threads));
+            return Error;
+        }
+    }
     QStringList positional = parser.positionalArguments();
     if (positional.isEmpty()) {
         errorText = tr("Missing PATTERN.");
@@ -62,8 +105,8 @@ FifCommandLine::Result FifCommandLine::parse(const QStringList& arguments)
     request = FifInput(parser.value(filter));
     request.what = positional.takeFirst();
     // Relative folders keep hit paths relative, as the user named them.
-    request.where =
-        positional.isEmpty() ? QStringLiteral(".") : positional.join(QObject::tr(";"));
+    folders = positional.isEmpty() ? QStringList{QStringLiteral(".")} : positional;
+    request.where = folders.join(QObject::tr(";"));
     request.matchCase = parser.isSet(matchCase) ? Qt::CaseSensitive : Qt::CaseInsensitive;
     request.matchType = parser.isSet(regexp)     ? QRegExp::RegExp2
                         : parser.isSet(wildcard) ? QRegExp::Wildcard
@@ -76,6 +119,21 @@ FifCommandLine::Result FifCommandLine::parse(const QStringList& arguments)
 FifInput FifCommandLine::getRequest() const
 {
     return request;
+}
+
+QStringList FifCommandLine::getFolders() const
+{
+    return folders;
+}
+
+FifCommandLine::ColorMode FifCommandLine::getColorMode() const
+{
+    return colorMode;
+}
+
+int FifCommandLine::getThreadCount() const
+{
+    return threadCount > 0 ? threadCount : QThread::idealThreadCount();
 }
 
 QString FifCommandLine::getErrorText() const

@@ -16,6 +16,8 @@ class FifCommandLine
 
 public:
     enum Result { Search, Help, Version, Error };
+    // When hits are coloured (--color).
+    enum ColorMode { ColorAuto, ColorAlways, ColorNever };
 
     // `arguments` includes the program name, as QCoreApplication gives them.
     Result parse(const QStringList& arguments);
@@ -23,6 +25,11 @@ public:
     // Valid after Search: the request as the arguments give it; the
     // expression itself is not checked.
     FifInput getRequest() const;
+    // The folders as named, in order.
+    QStringList getFolders() const;
+    ColorMode getColorMode() const;
+    // Scanning threads (-j): as given, else the number of cores.
+    int getThreadCount() const;
     // After Error: what was wrong, one line.
     QString getErrorText() const;
     QString getHelpText() const;
@@ -30,6 +37,9 @@ public:
 
 private:
     FifInput request;
+    QStringList folders;
+    ColorMode colorMode = ColorAuto;
+    int threadCount = 0;
     QString errorText;
     QString helpText;
 };

@@ -1,8 +1,9 @@
 #include "FifHitPrinter.h"
 
 #include "FifHit.h"
+#include "FifHitsModel.h"
 
-#include <QAbstractItemModel>
+#include <QDir>
 
 #include <cerrno>
 
@@ -12,19 +13,20 @@
 namespace Gui {
 namespace Orba {
 
-FifHitPrinter::FifHitPrinter(QAbstractItemModel* hitsModel, FILE* output, QObject* parent)
+FifHitPrinter::FifHitPrinter(FifHitsModel* hitsModel, FILE* output, const FifGrepColors& lineColors,
+                             QObject* parent)
     : QObject(parent)
     , model(hitsModel)
     , stream(output)
+    , colors(lineColors)
 {
-    // A row is inserted empty and gets its hit right after, so both signals
-    // may make rows ready.
     connect(model, &QAbstractItemModel::rowsInserted, this, [this] { printReadyRows(); });
-    connect(model, &QAbstractItemModel::dataChanged, this, [this] { printReadyRows(); });
     // A new search empties the model; its rows start again at 0.
     connect(model, &QAbstractItemModel::modelReset, this, [this] { nextRow = 0; });
     connect(model, &QAbstractItemModel::rowsRemoved, this,
-            [this] { nextRow = qMin(nextRow, model->rowCount()); });
+            [this](const QModelIndex&, int first, int last) {
+                nextRow -= qMax(0, qMin(last + 1, nextRow) - first);
+            });
 
     // A reader that leaves a pipe while no hit is being written would go
     // unnoticed until the next hit, which may be a long search away.
@@ -40,29 +42,91 @@ int FifHitPrinter::getWriteError() const
     return writeError;
 }
 
+int FifHitPrinter::getDroppedRows() const
+{
+    return droppedRows;
+}
+
 void FifHitPrinter::printReadyRows()
 {
     if (failed)
         return;
     const int rows = model->rowCount();
-    bool printed = false;
-    while (nextRow < rows) {
-        const FifHit hit = model->index(nextRow, 0).data(Qt::UserRole).value<FifHit>();
-        if (!hit.isValid())
-            break;
-        const QByteArray line = hit.toString().toUtf8() + '\n';
-        if (std::fwrite(line.constData(), 1, size_t(line.size()), stream)
-            != size_t(line.size())) {
-            writeFailed(errno);
-            return;
-        }
-        printed = true;
-        ++nextRow;
-    }
-    // A batch writes its rows one by one; flushing once its last row is out
-    // keeps the output prompt without a flush per line.
-    if (printed && nextRow == rows && std::fflush(stream) != 0)
+    output.resize(0);
+    output.reserve(64 * 1024);
+    for (; nextRow < rows; ++nextRow)
+        append(model->at(nextRow));
+    if (output.isEmpty())
+        return;
+    // One write and a flush a batch keep the output prompt without a
+    // flush per line.
+    if (std::fwrite(output.constData(), 1, size_t(output.size()), stream) != size_t(output.size())
+        || std::fflush(stream) != 0) {
         writeFailed(errno);
+        return;
+    }
+    // Not from inside the insertion: the model still tells of the new rows.
+    if (rows > keptRows && !dropPending) {
+        dropPending = true;
+        QMetaObject::invokeMethod(this, &FifHitPrinter::dropPrintedRows, Qt::QueuedConnection);
+    }
+}
+
+void FifHitPrinter::append(const FifHit& hit)
+{
+    // As FifHit::toString() has it: "file (line): text", in UTF-8.
+    if (hit.file.constData() != lastFile.constData() || hit.file != lastFile) {
+        lastFile = hit.file;
+        fileName = QDir::toNativeSeparators(lastFile).toUtf8();
+    }
+    colors.append(output, FifGrepColors::FileName, fileName);
+    colors.append(output, FifGrepColors::Separator, " (", 2);
+    // As QString::number() writes it.
+    char number[12];
+    char* digits = number + sizeof number;
+    unsigned magnitude = hit.line < 0 ? 0u - unsigned(hit.line) : unsigned(hit.line);
+    do {
+        *--digits = char('0' + magnitude % 10);
+        magnitude /= 10;
+    } while (magnitude);
+    if (hit.line < 0)
+        *--digits = '-';
+    colors.append(output, FifGrepColors::LineNumber, digits, number + sizeof number - digits);
+    colors.append(output, FifGrepColors::Separator, "): ", 3);
+    const QStringView text(hit.text);
+    if (colors.isEnabled() && hit.column >= 0 && hit.length > 0 && hit.column + hit.length <= text.size()) {
+        appendText(text.left(hit.column));
+        colors.append(output, FifGrepColors::Match, text.mid(hit.column, hit.length).toUtf8());
+        appendText(text.mid(hit.column + hit.length));
+    } else {
+        appendText(text);
+    }
+    FifGrepColors::appendPlain(output, "\n", 1);
+}
+
+void FifHitPrinter::appendText(QStringView text)
+{
+    if (!QtPrivate::isAscii(text)) {
+        output += text.toUtf8();
+        return;
+    }
+    // Most lines are ASCII: their bytes are their characters.
+    const qsizetype at = output.size();
+    output.resize(at + text.size());
+    char* out = output.data() + at;
+    const char16_t* in = text.utf16();
+    for (qsizetype i = 0; i < text.size(); ++i)
+        out[i] = char(in[i]);
+}
+
+void FifHitPrinter::dropPrintedRows()
+{
+    dropPending = false;
+    const int drop = qMin(nextRow, model->rowCount() - keptRows);
+    if (drop <= 0 || failed)
+        return;
+    model->removeRows(0, drop);
+    droppedRows += drop;
 }
 
 void FifHitPrinter::checkReader()

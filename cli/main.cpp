@@ -12,6 +12,7 @@
 #include "FifManager.h"
 
 #include <QCoreApplication>
+#include <QFile>
 #include <QObject>
 
 #include <cerrno>
@@ -19,6 +20,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include <dirent.h>
 #include <fcntl.h>
 #include <unistd.h>
 
@@ -31,6 +33,41 @@ void printError(const QString& text)
     std::fputs(text.toLocal8Bit().constData(), stderr);
     std::fputc('\n', stderr);
     std::fflush(stderr);
+}
+
+// Why a folder named on the command line cannot be searched, as grep tells
+// it; empty when it can.
+QString folderProblem(const QString& folder)
+{
+    DIR* opened = opendir(QFile::encodeName(folder).constData());
+    if (opened) {
+        closedir(opened);
+        return QString();
+    }
+    if (errno == ENOENT)
+        return QCoreApplication::translate("FifCommandLine", "No such folder");
+    return QString::fromLocal8Bit(std::strerror(errno));
+}
+
+// The job's closing line, counting the rows the printer has dropped too.
+QString resultText(const FifJob& job, int lines)
+{
+    // The job's own words (FifJob::getResultText()), which count only the
+    // rows its model still holds.
+    const char* context = "Gui::Orba::FifJob";
+    return QCoreApplication::translate(context, "Found %n line(s)", "", lines)
+           + QCoreApplication::translate(context, " in %n file(s)", "", job.getFileHitCount())
+           + QCoreApplication::translate(context, " out of %n file(s)", "",
+                                         job.getReadFileCount());
+}
+
+bool colorsWanted(FifCommandLine::ColorMode mode)
+{
+    if (mode != FifCommandLine::ColorAuto)
+        return mode == FifCommandLine::ColorAlways;
+    // As grep decides: a terminal that is not a dumb one.
+    const QByteArray terminal = qgetenv("TERM");
+    return isatty(STDOUT_FILENO) && !terminal.isEmpty() && terminal != "dumb";
 }
 
 
@@ -87,9 +124,23 @@ int main(int argc, char* argv[])
         return 2;
     }
 
+    // Like grep: a folder that cannot be searched is an error (status 2),
+    // and the others are searched all the same.
+    bool folderFailed = false;
+    for (const QString& folder : commandLine.getFolders()) {
+        const QString problem = folderProblem(folder);
+        if (!problem.isEmpty()) {
+            printError(QStringLiteral("fif: %1: %2").arg(folder, problem));
+            folderFailed = true;
+        }
+    }
+
     FifManager manager;
     FifJob* job = manager.getJob(0);
-    FifHitPrinter printer(job->getHitsModel(), stdout);
+    const FifGrepColors colors = colorsWanted(commandLine.getColorMode())
+                                     ? FifGrepColors::fromGrepColors(qgetenv("GREP_COLORS"))
+                                     : FifGrepColors();
+    FifHitPrinter printer(job->getHitsModel(), stdout, colors);
     QObject::connect(&printer, &FifHitPrinter::outputFailed, job, &FifJob::stop);
     QObject::connect(job, &QThread::finished, &app, [&] {
         // Hits sent before the end arrive before finished(), so every row
@@ -101,8 +152,9 @@ int main(int argc, char* argv[])
             app.exit(2);
             return;
         }
-        printError(job->getResultText());
-        app.exit(job->getLineHitCount() > 0 ? 0 : 1);
+        const int lines = printer.getDroppedRows() + job->getLineHitCount();
+        printError(resultText(*job, lines));
+        app.exit(folderFailed ? 2 : lines > 0 ? 0 : 1);
     });
     job->start(request);
     return app.exec();

@@ -17,6 +17,8 @@ set(FIF_PRIVATE_HEADERS
     ${PROJECT_SOURCE_DIR}/engine/FifOutbox.h
     ${PROJECT_SOURCE_DIR}/engine/FifLineScanner.h
     ${PROJECT_SOURCE_DIR}/engine/FifPrefilter.h
+    ${PROJECT_SOURCE_DIR}/engine/FifRegExpTranslator.h
+    ${PROJECT_SOURCE_DIR}/engine/FifAsciiMatcher.h
     ${PROJECT_SOURCE_DIR}/engine/FifTextTest.h
     ${PROJECT_SOURCE_DIR}/engine/FifLineCounter.h
     ${PROJECT_SOURCE_DIR}/engine/FifFileDevice.h
@@ -47,8 +49,13 @@ target_include_directories(FindInFiles PUBLIC
     $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/ui>
     $<BUILD_INTERFACE:${PROJECT_BINARY_DIR}/include>
     $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}/FindInFiles>)
+# PCRE2 decides lines of ASCII characters for regular expressions; tests and
+# fuzz targets that compile the internal classes in need it too.
+find_package(PkgConfig REQUIRED)
+pkg_check_modules(PCRE2 REQUIRED IMPORTED_TARGET libpcre2-8)
 target_link_libraries(FindInFiles
-    PUBLIC FindInFiles::Host Qt6::Core Qt6::Gui Qt6::Widgets Qt6::Core5Compat)
+    PUBLIC FindInFiles::Host Qt6::Core Qt6::Gui Qt6::Widgets Qt6::Core5Compat
+           $<BUILD_INTERFACE:PkgConfig::PCRE2>)
 
 set(_fif_public_headers ${FIF_ENGINE_SOURCES} ${FIF_UI_SOURCES})
 list(FILTER _fif_public_headers INCLUDE REGEX "\\.h$")

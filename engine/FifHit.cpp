@@ -31,15 +31,6 @@ FifHit::FifHit(const QString& fileName, int lineNumber, const QString& lineText,
 {
 }
 
-FifHit::FifHit(const FifHit& other) = default;
-FifHit& FifHit::operator=(const FifHit& other) = default;
-FifHit::~FifHit() = default;
-
-bool FifHit::isValid() const
-{
-    return line >= 0 && !job.isNull();
-}
-
 QString FifHit::toString() const
 {
     if (!isValid())

@@ -36,6 +36,12 @@ public:
     bool insertRows(int row, int count, const QModelIndex& parent = QModelIndex()) override;
     bool removeRows(int row, int count, const QModelIndex& parent = QModelIndex()) override;
 
+    // The hit of an existing row, for the GUI thread, which alone changes
+    // the rows and so reads them without the lock; the reference lasts until
+    // the rows change. A reader of many rows is spared a QVariant and a
+    // copy of the hit per row.
+    const FifHit& at(int row) const { return hits.at(row); }
+
 private:
     friend class FifJob;
     // Appends the valid hits of `batch` in its order, announced to views as

@@ -143,7 +143,8 @@ private:
 FifLineScanner::FifLineScanner(const QRegExp& expression, qint64 maxBytes, qint64 block)
     : rx(expression)
     , prefilter(expression)
-    , usePrefilter(prefilter.isActive())
+    , asciiMatcher(expression)
+    , usePrefilter(prefilter.isActive() || asciiMatcher.isActive())
     , maxLineBytes(qMax<qint64>(maxBytes, 1))
     , blockSize(qMax<qint64>(block, 1))
 {
@@ -222,10 +223,33 @@ bool FifLineScanner::readBlocks(QIODevice& device, Take take)
     }
 }
 
-void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars)
+FifLineScanner::Sifted FifLineScanner::sift(const char* begin, const char* end, const char* from,
+                                            int* column) const
+{
+    if (prefilter.isActive()) {
+        FifPrefilter::Cursor cursor;
+        const char* found = prefilter.find(from, end, cursor);
+        if (found == end)
+            return CannotMatch;
+        if (prefilter.isExact() && FifAsciiMatcher::isAscii(begin, end - begin)) {
+            *column = int(found - begin);
+            return MayMatch;
+        }
+    }
+    // PCRE2 rules out lines of ASCII characters only.
+    return asciiMatcher.match(begin, end - begin) == FifAsciiMatcher::NoMatch ? CannotMatchAscii
+                                                                               : MayMatch;
+}
+
+void FifLineScanner::matchLine(const QString& text, int terminatorLength, qint64 extraChars,
+                               int knownColumn)
 {
     int length = 0;
-    const int position = indexIn(text, &length);
+    int position = knownColumn;
+    if (knownColumn >= 0)
+        length = int(prefilter.getNeedle().size());
+    else
+        position = indexIn(text, &length);
     if (position >= 0) {
         hasHit = true;
         (*sink)(Match{clampToInt(lineNumber), clampToInt(offset + position),
@@ -276,10 +300,10 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
     auto finishLine = [&](bool newline) {
         const int terminator = line.end(newline);
         const QByteArray& bytes = line.keptBytes();
-        const char* end = bytes.constData() + bytes.size();
-        FifPrefilter::Cursor cursor;
+        int column = -1;
         if (usePrefilter && !line.isOverlong()
-            && prefilter.find(bytes.constData(), end, cursor) == end) {
+            && sift(bytes.constData(), bytes.constData() + bytes.size(), bytes.constData(), &column)
+                   != MayMatch) {
             // Only a line after it needs its length.
             if (newline) {
                 settle();
@@ -289,9 +313,26 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
         } else {
             settle();
             const qint64 rest = line.countRest();
-            matchLine(decoder.decode(bytes), terminator, rest);
+            matchLine(decoder.decode(bytes), terminator, rest, column);
         }
         line.clear();
+        return !stopped;
+    };
+
+    // The same for a line that lies whole in the buffer, ended by "\n"
+    // and kept whole: sifted and decoded where it lies. No match starts
+    // before `candidate`.
+    auto finishWholeLine = [&](const char* lineStart, const char* newline, const char* candidate) {
+        const bool crlf = newline > lineStart && newline[-1] == '\r';
+        const char* end = newline - (crlf ? 1 : 0);
+        int column = -1;
+        const Sifted sifted = usePrefilter ? sift(lineStart, end, qMin(candidate, end), &column) : MayMatch;
+        if (sifted == CannotMatchAscii)
+            advance(end - lineStart, crlf ? 2 : 1);
+        else if (sifted == CannotMatch)
+            advance(FifLineCounter::utf16Length(lineStart, end - lineStart, decoder), crlf ? 2 : 1);
+        else
+            matchLine(decoder.decode(QByteArrayView(lineStart, end - lineStart)), crlf ? 2 : 1, 0, column);
         return !stopped;
     };
 
@@ -313,9 +354,14 @@ void FifLineScanner::scanUtf8(QIODevice& device, FifFileDecoder& decoder)
             pollDue = passOver(begin, lineStart) || pollDue;
             if ((pollDue || lineNumber % pollInterval == 0) && stopRequested())
                 return false;
-            line.add(lineStart, newline - lineStart);
-            if (!finishLine(true))
-                return false;
+            if (newline - lineStart <= maxLineBytes) {
+                if (!finishWholeLine(lineStart, newline, candidate))
+                    return false;
+            } else {
+                line.add(lineStart, newline - lineStart);
+                if (!finishLine(true))
+                    return false;
+            }
             begin = newline + 1;
         }
         uncountedFrom = begin;

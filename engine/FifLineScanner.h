@@ -1,5 +1,6 @@
 #pragma once
 
+#include "FifAsciiMatcher.h"
 #include "FifFileDecoder.h"
 #include "FifFileDevice.h"
 #include "FifPrefilter.h"
@@ -63,9 +64,14 @@ public:
     bool scan(QIODevice& device, const MatchSink& sink, const StopPoll& shouldStop);
 
     // Whether UTF-8 lines that cannot match are passed over undecoded (the
-    // default whenever the expression allows it). Off, every line is
-    // decoded and matched: the results are the same, only slower.
-    void setPrefilterEnabled(bool enabled) { usePrefilter = enabled && prefilter.isActive(); }
+    // default whenever the expression allows it): those without the text
+    // every match holds (FifPrefilter), and lines of ASCII characters that
+    // PCRE2 finds no match in (FifAsciiMatcher). Off, every line is decoded
+    // and matched by QRegExp: the results are the same, only slower.
+    void setPrefilterEnabled(bool enabled)
+    {
+        usePrefilter = enabled && (prefilter.isActive() || asciiMatcher.isActive());
+    }
     bool isPrefilterEnabled() const { return usePrefilter; }
 
 private:
@@ -78,7 +84,17 @@ private:
     void scanDecoded(QIODevice& device, FifFileDecoder& decoder);
     // Matches one line and advances the counters past it. `extraChars` are
     // characters of the line that were not kept in `text`.
-    void matchLine(const QString& text, int terminatorLength, qint64 extraChars);
+    // `knownColumn`, when not -1, is where the first match starts, found
+    // without QRegExp (see sift()).
+    void matchLine(const QString& text, int terminatorLength, qint64 extraChars,
+                   int knownColumn = -1);
+    // Whether the UTF-8 line [begin, end) may match (and, when it cannot,
+    // whether it is known to be ASCII: its length is then its size). No
+    // match starts before `from`. Where the prefilter's needle is the whole
+    // expression and the line is ASCII, the first place it is found is the
+    // first match: `column` is set to it.
+    enum Sifted { CannotMatch, CannotMatchAscii, MayMatch };
+    Sifted sift(const char* begin, const char* end, const char* from, int* column) const;
     void advance(qint64 chars, int terminatorLength);
     // The first match in `text`, as rx.indexIn() with QRegExp::CaretAtZero
     // finds it, and its length; sets `stopped` when a stop request ends the
@@ -88,6 +104,7 @@ private:
 
     QRegExp rx;
     FifPrefilter prefilter;
+    FifAsciiMatcher asciiMatcher;
     bool usePrefilter;
     qint64 maxLineBytes;
     qint64 blockSize;

@@ -214,6 +214,7 @@ FifPrefilter::FifPrefilter(const QRegExp& rx)
     }
     const bool caseSensitive = rx.caseSensitivity() == Qt::CaseSensitive;
     needle = literal.toLatin1();
+    exact = rx.patternSyntax() == QRegExp::FixedString && !needle.isEmpty();
     foldMask = QByteArray(needle.size(), '\0');
     if (!caseSensitive) {
         bool kelvin = false;

@@ -28,6 +28,10 @@ public:
     bool isActive() const { return !needle.isEmpty(); }
     // The piece every match contains; empty when inactive.
     QByteArray getNeedle() const { return needle; }
+    // Whether the needle is the whole expression (a literal of ASCII
+    // characters): in a line of ASCII characters the first place found is
+    // then the first match, and the needle's length its length.
+    bool isExact() const { return exact; }
 
     // Remembers where the special characters were last seen, so that a
     // buffer is searched for them once, not once per candidate.
@@ -55,6 +59,7 @@ private:
     // 0x20 where the needle's byte is a letter compared without case.
     QByteArray foldMask;
     QList<QByteArray> specials;  // UTF-8 of the non-ASCII equivalents
+    bool exact = false;
 };
 
 } // namespace Orba

@@ -18,7 +18,7 @@ fif_install_packages() {
 }
 
 # What building the library, the application and the tests needs.
-FIF_BUILD_PACKAGES=(cmake ninja-build g++ pkg-config libgl-dev
+FIF_BUILD_PACKAGES=(cmake ninja-build g++ pkg-config libgl-dev libpcre2-dev
   qt6-base-dev qt6-5compat-dev qt6-tools-dev qt6-tools-dev-tools qt6-l10n-tools
   libqt6svg6 qt6-qpa-plugins fonts-dejavu-core
   desktop-file-utils)  # the test of the installed desktop entry validates it

@@ -105,6 +105,30 @@ private slots:
                                : r.err == err, qPrintable(r.err));
         QCOMPARE(r.code, !out.isEmpty() ? 0 : err.isEmpty() || err.startsWith("Found") ? 1 : 2);
     }
+    // As grep: a folder that cannot be searched is reported and makes the status 2, the others are still
+    // searched; the colours are grep's own (its line for the same hit, with fif's separators); bad values
+    // of options are refused.
+    void likeGrep()
+    {
+        const Run r = run({fif, "--match-case", "needle", "src/sub", "nosuch", "src/b.h"});
+        QCOMPARE(r.out, "src/sub/c.cpp (1): x needle y\n");
+        QVERIFY2(r.err.startsWith("fif: nosuch: No such folder\nfif: src/b.h: " + QString(strerror(ENOTDIR))
+                                  + "\nFound 1 line(s) in 1 file(s)") && r.code == 2, qPrintable(r.err));
+        const QRegularExpression separator("(\\e\\[[0-9;]*m(?:\\e\\[K)?):(\\e\\[m(?:\\e\\[K)?)");
+        for (const char* colors : {"", "ms=04;35:ln=33:se=34:ne:fn=1", "mt=7:fn=:se=36"}) {
+            qputenv("GREP_COLORS", colors);
+            QString want = run({"grep", "--color=always", "-Hn", "needle", "src/b.h"}).out;
+            for (const char* replacement : {" (", "): "}) {
+                const QRegularExpressionMatch m = separator.match(want);
+                want.replace(m.capturedStart(), m.capturedLength(), m.captured(1) + replacement + m.captured(2));
+            }
+            QCOMPARE(run({fif, "--colour=always", "--filter=b.h", "needle", "src"}).out, want);
+        }
+        QCOMPARE(run({fif, "--color", "--filter=b.h", "needle", "src"}).out, "src/b.h (1): // needle\n");
+        for (const char* bad : {"--color=sometimes", "-j0", "--threads=x"})
+            QCOMPARE(run({fif, bad, "needle", "src"}).code, 2);
+        QCOMPARE(run({fif, "-j", "3", "--color=never", "--filter=b.h", "needle", "src"}).out, "src/b.h (1): // needle\n");
+    }
     // A reader that leaves stops the search: fif ends normally, having found
     // fewer lines than there are. Started without standard output, it writes
     // into no descriptor that took its place.

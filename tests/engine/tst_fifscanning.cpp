@@ -1,6 +1,7 @@
 // Scanning a file's bytes (line scanner, line counter, prefilter, text test, file device), checked against
 // a plain reading of the same bytes: FifReference, QStringDecoder, QRegExp on whole lines.
 
+#include "FifAsciiMatcher.h"
 #include "FifFileDevice.h"
 #include "FifLineCounter.h"
 #include "FifLineScanner.h"
@@ -40,7 +41,11 @@ Scan scan(const QByteArray& bytes, const QRegExp& rx, qint64 block = bigBlock, b
     scanner.setPrefilterEnabled(prefilter);
     s.hasHit = scanner.scan(
         device ? *device : buffer,
-        [&](const FifLineScanner::Match& m) { s.hits.append({m.line, m.offset, m.rawOffset, m.text}); },
+        [&](const FifLineScanner::Match& m) {
+            QRegExp whole(rx);  // the first match as QRegExp finds it in the whole line
+            QVERIFY(whole.indexIn(m.text, 0, QRegExp::CaretAtZero) == m.column && whole.matchedLength() == m.length);
+            s.hits.append({m.line, m.offset, m.rawOffset, m.text});
+        },
         [&] {
             if (++s.polls >= stopAt && stopAt > 0 && s.hitsAtStop < 0)
                 s.hitsAtStop = s.hits.size();
@@ -354,6 +359,48 @@ private slots:
         QCOMPARE(QString::fromLatin1(prefilter.getNeedle()), needle);
         if (type == rx2)
             QCOMPARE(FifPrefilter::requiredLiteral(pattern), needle);
+    }
+
+    void asciiMatcher_data()
+    {
+        QTest::addColumn<QString>("pattern");
+        QTest::addColumn<bool>("matchCase");
+        QTest::addColumn<bool>("taken");  // translated for PCRE2
+        const QList<std::tuple<const char*, bool, bool>> rows = {
+            {"Q_[A-Z]+_EXPORT", true, true}, {"[0-9]+\\.[0-9]+\\.[0-9]+", true, true}, {"colou?r", false, true},
+            {"^a|b$|\\bk\\w*\\B", false, true}, {"(a|b(?:c|))*d{2}e{1,3}f{,2}g{2,}", false, true},
+            {"x(?=ab)(?!abc)[^\\s\\d]", true, true}, {"\\x41\\0102\\t\\.[\\x61-\\x63\\]]", false, true},
+            {"[K-k]s{0}.", false, true}, {"[^\\x212a]é", true, true}, {"()|", false, true},
+            {"(a)\\1", true, false}, {"\\q", true, false}, {"[]a]", true, false}, {"[[:alpha:]]", true, false},
+            {"a(?!\\b)", true, false}, {"(?=^)a", true, false}, {"(?=a)*", true, false}, {"\\x", true, false},
+            {"é", false, false}, {"[\\x212a]", false, false}, {"\\0377", false, false}, {"a{1001}", true, false}};
+        for (const auto& [pattern, matchCase, taken] : rows)
+            QTest::addRow("%s %s", pattern, matchCase ? "case" : "no case") << QString::fromUtf8(pattern) << matchCase << taken;
+    }
+
+    // PCRE2's verdict on random lines of ASCII characters is QRegExp's; other lines it leaves to QRegExp.
+    void asciiMatcher()
+    {
+        QFETCH(QString, pattern);
+        QFETCH(bool, matchCase);
+        QFETCH(bool, taken);
+        const QRegExp rx(pattern, matchCase ? cs : ci, rx2);
+        const FifAsciiMatcher matcher(rx);
+        QCOMPARE(matcher.isActive(), taken);
+        QRandomGenerator random(77);
+        const QString pieces = "aAbBcdDeEfgkKQrRsSuxX_059.-\\t\r ]()";
+        for (int round = 0; round < 3000; ++round) {
+            QString line;
+            for (int i = random.bounded(12); i > 0; --i)
+                line += pieces.at(random.bounded(int(pieces.size())));
+            if (round % 10 == 0)
+                line.insert(random.bounded(int(line.size()) + 1), QChar(round % 20 ? 0x212A : 0xE9));
+            const QByteArray bytes = line.toUtf8();
+            const auto verdict = matcher.match(bytes.constData(), bytes.size());
+            const bool plain = line.toLatin1() == bytes && taken;
+            QVERIFY2(plain ? verdict == (rx.indexIn(line) >= 0 ? FifAsciiMatcher::Match : FifAsciiMatcher::NoMatch)
+                           : verdict == FifAsciiMatcher::Unknown, qPrintable(line));
+        }
     }
 
     // Without case QRegExp equates no character beyond ASCII with an ASCII one but U+212A KELVIN SIGN
