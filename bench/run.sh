@@ -1,15 +1,18 @@
 #!/usr/bin/env bash
-# Times a Release build of fif against GNU grep and ripgrep (one thread and
-# two) on real trees, for literal text and for regular expressions and
-# wildcards, case-sensitive and not, rare and frequent words.
+# Times a Release build of fif, with its default threads (one per core) and
+# with one (-j1), against GNU grep and ripgrep (one thread and two) on real
+# trees, for literal text and for regular expressions and wildcards,
+# case-sensitive and not, rare and frequent words.
 #
 # Usage: bench/run.sh [TREE...]          (default: /usr/include /usr/share)
 #   RUNS=n    timed runs per command after one warm-up (default 5)
 #   CASES=re  run only the cases whose label matches the regular expression
+#   FIF=path  time this fif rather than building one
 #
-# Before a case is timed, the hit sets of fif and each peer must agree: every
-# (file, line) hit that only one side reports must be explained by how the
-# tools tell binary files (bench/compare-hits.pl), or no times are printed.
+# Before a case is timed, fif -j1 must print exactly what fif does, and the
+# hit sets of fif and each peer must agree: every (file, line) hit that only
+# one side reports must be explained by how the tools tell binary files
+# (bench/compare-hits.pl), or no times are printed.
 # Wall times are hyperfine medians, every tool's output going through a pipe
 # (grep would take a shortcut for /dev/null); CPU is the mean user + system
 # time. The machine may be shared: peers are timed in the same run, so read
@@ -24,11 +27,14 @@ only="${CASES:-.}"
 trees=("$@")
 [ ${#trees[@]} -gt 0 ] || trees=(/usr/include /usr/share)
 
-build="$root/build/bench"
-cmake -S "$root" -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=Release \
-      -DFIF_BUILD_TESTS=OFF -DFIF_BUILD_APP=OFF >/dev/null
-cmake --build "$build" --target fif >/dev/null
-fif="$build/cli/fif"
+fif="${FIF:-}"
+if [ -z "$fif" ]; then
+  build="$root/build/bench"
+  cmake -S "$root" -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=Release \
+        -DFIF_BUILD_TESTS=OFF -DFIF_BUILD_APP=OFF >/dev/null
+  cmake --build "$build" --target fif >/dev/null
+  fif="$build/cli/fif"
+fi
 
 work="$(mktemp -d)"
 trap 'rm -rf "$work"' EXIT
@@ -47,13 +53,21 @@ run_case() { # tree, label, fif-args, grep-args, rg-args
   local tree="$1" label="$2" fif_args="$3" grep_args="$4" rg_args="$5"
   [[ "$label" =~ $only ]] || return 0
   local fif_cmd="'$fif' $fif_args '$tree'"
+  local fif1_cmd="'$fif' -j1 $fif_args '$tree'"
   local grep_cmd="LC_ALL=C grep -r -n $grep_args '$tree'"
   local rg_cmd="rg -n --no-heading -H -uu --no-config $rg_args '$tree'"
 
+  local check=0
+  eval "$fif_cmd" >"$work/out" 2>"$work/err" || true
+  eval "$fif1_cmd" >"$work/out1" 2>"$work/err1" || true
+  if ! cmp -s "$work/out" "$work/out1" || ! cmp -s "$work/err" "$work/err1"; then
+    echo "== $label: fif -j1 prints otherwise than fif; no times" >&2
+    diff "$work/out" "$work/out1" | head -5 >&2
+    return 1
+  fi
   hits_of fif "$fif_cmd"
   hits_of grep "$grep_cmd"
   hits_of rg "$rg_cmd"
-  local check=0
   perl "$root/bench/compare-hits.pl" "$work/fif" "$work/grep" grep >"$work/check" || check=1
   perl "$root/bench/compare-hits.pl" "$work/fif" "$work/rg" rg >>"$work/check" || check=1
   if [ $check -ne 0 ]; then
@@ -64,16 +78,16 @@ run_case() { # tree, label, fif-args, grep-args, rg-args
 
   hyperfine --style none --output pipe --ignore-failure --warmup 1 --runs "$runs" \
     --export-json "$work/times.json" \
-    -n fif "$fif_cmd" -n grep "$grep_cmd" \
+    -n fif "$fif_cmd" -n "fif -j1" "$fif1_cmd" -n grep "$grep_cmd" \
     -n "rg -j1" "$rg_cmd -j1" -n "rg -j2" "$rg_cmd -j2" >/dev/null 2>&1
   perl -e '
     local $/; my $json = <STDIN>;
     my @m = $json =~ /"median":\s*([0-9.eE+-]+)/g;
     my @u = $json =~ /"user":\s*([0-9.eE+-]+)/g;
     my @s = $json =~ /"system":\s*([0-9.eE+-]+)/g;
-    printf "%-28s %8d hits | wall fif %6.3f grep %6.3f rg1 %6.3f rg2 %6.3f | fif/grep %5.2f fif/rg1 %5.2f fif/rg2 %5.2f | cpu fif %6.3f grep %6.3f\n",
-      $ARGV[0], $ARGV[1], @m[0..3], $m[0] / $m[1], $m[0] / $m[2], $m[0] / $m[3],
-      $u[0] + $s[0], $u[1] + $s[1];
+    printf "%-28s %8d hits | wall fif %6.3f fif1 %6.3f grep %6.3f rg1 %6.3f rg2 %6.3f | fif/rg2 %5.2f fif1/rg1 %5.2f fif/grep %5.2f | cpu fif %6.3f fif1 %6.3f rg2 %6.3f\n",
+      $ARGV[0], $ARGV[1], @m[0..4], $m[0] / $m[4], $m[1] / $m[3], $m[0] / $m[2],
+      $u[0] + $s[0], $u[1] + $s[1], $u[4] + $s[4];
   ' "$label" "$(wc -l <"$work/fif")" <"$work/times.json"
   sed 's/^/    /' "$work/check"
 }

@@ -137,6 +137,7 @@ int main(int argc, char* argv[])
 
     FifManager manager;
     FifJob* job = manager.getJob(0);
+    job->setThreadCount(commandLine.getThreadCount());
     const FifGrepColors colors = colorsWanted(commandLine.getColorMode())
                                      ? FifGrepColors::fromGrepColors(qgetenv("GREP_COLORS"))
                                      : FifGrepColors();

@@ -336,17 +336,16 @@ private slots:
         // Started again, the job searches to the end, its counters from zero.
         QVERIFY(FifTest::run(job, all) && job->getReadFileCount() == 6 && job->getFileHitCount() == 6);
         QCOMPARE(job->getLineHitCount(), 6 * 300);
-        // A manager destroyed stops its running jobs and waits for their threads.
+        // A manager destroyed stops its running jobs and waits for their
+        // threads (a QThread destroyed while it runs would abort the test,
+        // and the stuck one never ends unless stopped).
         const FifHit kept = FifTest::hits(job->getHitsModel()).value(0);
         const QList<QPointer<FifJob>> jobs{job, manager->getJob(1)};
-        QAtomicInt ended;
-        for (FifJob* running : {jobs[0].data(), jobs[1].data()})
-            connect(running, &QThread::finished, this, [&ended] { ended.ref(); }, Qt::DirectConnection);
         QVERIFY(jobs[0]->start(FifTest::request("*", big, QRegExp::Wildcard)) && jobs[1]->start(stuck));
         QThread::msleep(20);  // hits queue up for this thread
         QVERIFY(kept.isValid() && jobs[1]->isRunning());
         manager.reset();
-        QVERIFY(ended.loadRelaxed() == 2 && !jobs[0] && !jobs[1]);
+        QVERIFY(!jobs[0] && !jobs[1]);
         QVERIFY(!kept.isValid() && kept.toString().isEmpty() && kept.getCanonicalFilePath().isEmpty());
         QTest::qWait(20);  // what was queued for the jobs went with them
     }
