@@ -54,7 +54,12 @@
         <translation type="unfinished"></translation>
     </message>
     <message>
-        <location line="+20"/>
+        <location line="+10"/>
+        <source>File-name patterns separated by &quot;;&quot;, e.g. *.cpp;*.h. A pattern that starts with &quot;!&quot; excludes the files and the folders it names, whose files are then not searched: *.cpp;*.h;!moc_*;!build;!.git</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+13"/>
         <source>Append</source>
         <translation type="unfinished"></translation>
     </message>
@@ -122,27 +127,7 @@
 <context>
     <name>Gui::Orba::FifDialog</name>
     <message>
-        <location filename="../ui/FifDialog.cpp" line="+157"/>
-        <source>Empty Expression</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+1"/>
-        <source>Please enter the search expression in the &quot;Find what:&quot; field.</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+21"/>
-        <source>%1: &quot;%2&quot;</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+1"/>
-        <source>Bad Expression</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+66"/>
+        <location filename="../ui/FifDialog.cpp" line="+236"/>
         <source>Find Directory</source>
         <translation type="unfinished"></translation>
     </message>
@@ -150,7 +135,7 @@
 <context>
     <name>Gui::Orba::FifHitsModel</name>
     <message>
-        <location filename="../engine/FifHitsModel.cpp" line="+71"/>
+        <location filename="../engine/FifHitsModel.cpp" line="+82"/>
         <source>No Search Results</source>
         <translation type="unfinished"></translation>
     </message>
@@ -158,7 +143,7 @@
 <context>
     <name>Gui::Orba::FifHitsView</name>
     <message>
-        <location filename="../ui/FifHitsView.cpp" line="+57"/>
+        <location filename="../ui/FifHitsView.cpp" line="+58"/>
         <location line="+1"/>
         <source>Clear All</source>
         <translation type="unfinished"></translation>
@@ -214,12 +199,40 @@
         <translation type="unfinished"></translation>
     </message>
     <message>
-        <location line="+215"/>
+        <location line="+225"/>
         <source>Searching...</source>
         <translation type="unfinished"></translation>
     </message>
+    <message>
+        <location line="+20"/>
+        <source>Searching %1</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+99"/>
+        <source>Reach bottom</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+0"/>
+        <source>Reach bottom, continued from top?</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+5"/>
+        <source>Reach top</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+0"/>
+        <source>Reach top, continued from bottom?</source>
+        <translation type="unfinished"></translation>
+    </message>
+</context>
+<context>
+    <name>Gui::Orba::FifJob</name>
     <message numerus="yes">
-        <location line="+8"/>
+        <location filename="../engine/FifJob.cpp" line="+127"/>
         <source>Found %n line(s)</source>
         <translation type="unfinished">
             <numerusform></numerusform>
@@ -238,31 +251,6 @@
         <translation type="unfinished">
             <numerusform></numerusform>
         </translation>
-    </message>
-    <message>
-        <location line="+13"/>
-        <source>Searching %1</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+96"/>
-        <source>Reach bottom</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+0"/>
-        <source>Reach bottom, continued from top?</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+5"/>
-        <source>Reach top</source>
-        <translation type="unfinished"></translation>
-    </message>
-    <message>
-        <location line="+0"/>
-        <source>Reach top, continued from bottom?</source>
-        <translation type="unfinished"></translation>
     </message>
 </context>
 <context>
@@ -354,7 +342,27 @@
 <context>
     <name>QObject</name>
     <message>
-        <location filename="../engine/FifInput.cpp" line="+116"/>
+        <location filename="../engine/FifInput.cpp" line="+50"/>
+        <source>Empty Expression</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+1"/>
+        <source>Please enter the search expression in the &quot;Find what:&quot; field.</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+5"/>
+        <source>Bad Expression</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+2"/>
+        <source>%1: &quot;%2&quot;</source>
+        <translation type="unfinished"></translation>
+    </message>
+    <message>
+        <location line="+48"/>
         <source>Find regular expression &quot;%1&quot;</source>
         <translation type="unfinished"></translation>
     </message>
@@ -394,13 +402,13 @@
         <translation type="unfinished"></translation>
     </message>
     <message>
-        <location filename="../engine/FifWorker.cpp" line="+32"/>
-        <location line="+26"/>
+        <location filename="../engine/FifWorker.cpp" line="+21"/>
+        <location line="+21"/>
         <source>;</source>
         <translation type="unfinished"></translation>
     </message>
     <message>
-        <location line="-20"/>
+        <location line="+6"/>
         <source>Current Directory</source>
         <translation type="unfinished"></translation>
     </message>
