@@ -96,7 +96,7 @@ run_case() { # tree, label, fif-args, grep-args, rg-args
 peak_memory() { # label, fif-args, grep-args, tree
   [[ "$1" =~ $only ]] || return 0
   /usr/bin/time -o "$work/fif.mem" -f %M sh -c "'$fif' $2 '$4' 2>/dev/null | cat >/dev/null"
-  /usr/bin/time -o "$work/grep.mem" -f %M sh -c "LC_ALL=C grep -r -n $3 '$4' | cat >/dev/null"
+  /usr/bin/time -o "$work/grep.mem" -f %M sh -c "LC_ALL=C grep -r -n $3 '$4' 2>/dev/null | cat >/dev/null"
   printf "%-28s peak resident fif %d MB, grep %d MB\n" "$1" \
     $(( $(tail -1 "$work/fif.mem") / 1024 )) $(( $(tail -1 "$work/grep.mem") / 1024 ))
 }
