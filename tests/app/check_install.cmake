@@ -3,19 +3,8 @@
 # names it and its icon (validated by desktop-file-validate where that is
 # installed), the icon in the hicolor theme, and --help and --version
 # answered without a display.
-foreach(var BINARY_DIR WORK_DIR VERSION)
-  if(NOT DEFINED ${var})
-    message(FATAL_ERROR "${var} not set")
-  endif()
-endforeach()
-
-file(REMOVE_RECURSE ${WORK_DIR})
-set(prefix ${WORK_DIR}/prefix)
-execute_process(COMMAND ${CMAKE_COMMAND} --install ${BINARY_DIR} --prefix ${prefix}
-                RESULT_VARIABLE result OUTPUT_QUIET)
-if(result)
-  message(FATAL_ERROR "install failed: ${result}")
-endif()
+include(${CMAKE_CURRENT_LIST_DIR}/../common/StageInstall.cmake)
+stage_install(VERSION)
 
 set(entry ${prefix}/share/applications/findinfiles.desktop)
 file(STRINGS ${entry} exec REGEX "^Exec=")

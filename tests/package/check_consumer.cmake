@@ -1,18 +1,7 @@
 # Installs the project into a staging prefix, builds the consumer project
 # against it and runs the consumer on a small tree.
-foreach(var BINARY_DIR SOURCE_DIR WORK_DIR)
-  if(NOT DEFINED ${var})
-    message(FATAL_ERROR "${var} not set")
-  endif()
-endforeach()
-
-file(REMOVE_RECURSE ${WORK_DIR})
-set(prefix ${WORK_DIR}/prefix)
-execute_process(COMMAND ${CMAKE_COMMAND} --install ${BINARY_DIR} --prefix ${prefix}
-                RESULT_VARIABLE result OUTPUT_QUIET)
-if(result)
-  message(FATAL_ERROR "install failed: ${result}")
-endif()
+include(${CMAKE_CURRENT_LIST_DIR}/../common/StageInstall.cmake)
+stage_install(SOURCE_DIR)
 # The staged package must be relocatable: move it before use.
 file(RENAME ${prefix} ${WORK_DIR}/moved)
 set(prefix ${WORK_DIR}/moved)
