@@ -45,7 +45,10 @@ public:
     void deliverAll();
 
     // The work the queue holds at most before posting waits: hits and files.
-    static constexpr qsizetype capacity = 8192;
+    // Room for the hits found while a large view relayouts its rows (tens of
+    // milliseconds at a million rows), so that the search does not stall
+    // behind every relayout; a few megabytes at most.
+    static constexpr qsizetype capacity = 16384;
     // How often the GUI thread takes events while they keep coming, and for
     // how long at most before it lets its event loop run.
     static constexpr int intervalMs = 5;
