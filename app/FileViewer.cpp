@@ -140,9 +140,10 @@ void FileViewer::resizeEvent(QResizeEvent* event)
 
 void FileViewer::updateGutter()
 {
-    setViewportMargins(gutter->sizeHint().width(), 0, 0, 0);
+    const int width = gutter->sizeHint().width();
+    setViewportMargins(width, 0, 0, 0);
     const QRect area = contentsRect();
-    gutter->setGeometry(area.left(), area.top(), gutter->sizeHint().width(), area.height());
+    gutter->setGeometry(area.left(), area.top(), width, area.height());
 }
 
 void FileViewer::openInEditor()
@@ -193,7 +194,7 @@ void FileViewer::selectMatch(const Gui::Orba::FifHit& hit)
     if (!block.isValid()) // the file has lost lines since the search
         block = document()->lastBlock();
     const QString text = block.text();
-    const QRegExp rx = hit.job ? hit.job->getInput().getRegExp() : QRegExp();
+    QRegExp rx = hit.job ? hit.job->getInput().getRegExp() : QRegExp();
 
     // On a line as the search read it, the hit tells where its match is. A
     // line changed since is matched again: at the hit's column first, else
@@ -202,12 +203,11 @@ void FileViewer::selectMatch(const Gui::Orba::FifHit& hit)
     int length = hit.length;
     if (column < 0 || text != toDocumentText(hit.text)) {
         column = hit.offset - block.position();
-        QRegExp again = rx;
-        if (column >= 0 && column <= text.size() && again.indexIn(text, column) == column) {
-            length = again.matchedLength();
-        } else if (again.indexIn(text) >= 0) {
-            column = again.pos();
-            length = again.matchedLength();
+        if (column >= 0 && column <= text.size() && rx.indexIn(text, column) == column) {
+            length = rx.matchedLength();
+        } else if (rx.indexIn(text) >= 0) {
+            column = rx.pos();
+            length = rx.matchedLength();
         } else {
             column = 0;
             length = text.size();

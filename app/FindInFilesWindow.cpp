@@ -52,11 +52,6 @@ FindInFilesWindow::FindInFilesWindow(const QString& folder, QWidget* parent)
     createDocks();
     createMenus();
     updateFindAction();
-    // The searches of both docks scan with the threads the settings name.
-    ApplicationBase* application = ApplicationBase::getInstance();
-    const int threads = FifSettings().getThreadCount(application ? application->getSettings() : nullptr);
-    for (int slot = 0; slot < 2; ++slot)
-        FifManager::getInstance(this)->getJob(slot)->setThreadCount(threads);
     statusBar()->showMessage(tr("Ready"));
     resize(960, 720);
 }
@@ -164,7 +159,12 @@ void FindInFilesWindow::createActions()
 
 void FindInFilesWindow::createDocks()
 {
+    // The searches of both docks scan with the threads the settings name.
+    ApplicationBase* application = ApplicationBase::getInstance();
+    const int threads = FifSettings().getThreadCount(application ? application->getSettings() : nullptr);
+    FifManager* manager = FifManager::getInstance(this);
     for (int i = 0; i < 2; ++i) {
+        manager->getJob(i)->setThreadCount(threads);
         auto* dock = new FifResultsDockWidget(this);
         docks[i] = dock;
         dock->linkSharedActions(nextAction, previousAction, stopAction);
@@ -181,7 +181,7 @@ void FindInFilesWindow::createDocks()
     // its own tool bar), so it is not shown and raised by every search of
     // the Find in Files command, which runs on slot 0.
     if (auto* view = qobject_cast<FifHitsView*>(docks[1]->widget()))
-        view->setJob(FifManager::getInstance(this)->getJob(1));
+        view->setJob(manager->getJob(1));
     docks[1]->setWindowTitle(tr("Find in Files Results (2)"));
     tabifyDockWidget(docks[0], docks[1]);
     docks[1]->hide();

@@ -2,7 +2,6 @@
 
 #include <QCommandLineParser>
 #include <QObject>
-#include <QThread>
 
 namespace Gui {
 namespace Orba {
@@ -133,7 +132,7 @@ FifCommandLine::ColorMode FifCommandLine::getColorMode() const
 
 int FifCommandLine::getThreadCount() const
 {
-    return threadCount > 0 ? threadCount : QThread::idealThreadCount();
+    return threadCount;
 }
 
 QString FifCommandLine::getErrorText() const

@@ -28,7 +28,7 @@ public:
     // The folders as named, in order.
     QStringList getFolders() const;
     ColorMode getColorMode() const;
-    // Scanning threads (-j): as given, else the number of cores.
+    // Scanning threads (-j): as given, else 0, one per core (as the job takes it).
     int getThreadCount() const;
     // After Error: what was wrong, one line.
     QString getErrorText() const;

@@ -75,7 +75,7 @@ void FifHitPrinter::printReadyRows()
 void FifHitPrinter::append(const FifHit& hit)
 {
     // As FifHit::toString() has it: "file (line): text", in UTF-8.
-    if (hit.file.constData() != lastFile.constData() || hit.file != lastFile) {
+    if (hit.file != lastFile) {
         lastFile = hit.file;
         fileName = QDir::toNativeSeparators(lastFile).toUtf8();
     }
@@ -94,7 +94,7 @@ void FifHitPrinter::append(const FifHit& hit)
     colors.append(output, FifGrepColors::LineNumber, digits, number + sizeof number - digits);
     colors.append(output, FifGrepColors::Separator, "): ", 3);
     const QStringView text(hit.text);
-    if (colors.isEnabled() && hit.column >= 0 && hit.length > 0 && hit.column + hit.length <= text.size()) {
+    if (colors.isEnabled() && hit.hasMatchRange()) {
         appendText(text.left(hit.column));
         colors.append(output, FifGrepColors::Match, text.mid(hit.column, hit.length).toUtf8());
         appendText(text.mid(hit.column + hit.length));

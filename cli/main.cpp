@@ -49,18 +49,6 @@ QString folderProblem(const QString& folder)
     return QString::fromLocal8Bit(std::strerror(errno));
 }
 
-// The job's closing line, counting the rows the printer has dropped too.
-QString resultText(const FifJob& job, int lines)
-{
-    // The job's own words (FifJob::getResultText()), which count only the
-    // rows its model still holds.
-    const char* context = "Gui::Orba::FifJob";
-    return QCoreApplication::translate(context, "Found %n line(s)", "", lines)
-           + QCoreApplication::translate(context, " in %n file(s)", "", job.getFileHitCount())
-           + QCoreApplication::translate(context, " out of %n file(s)", "",
-                                         job.getReadFileCount());
-}
-
 bool colorsWanted(FifCommandLine::ColorMode mode)
 {
     if (mode != FifCommandLine::ColorAuto)
@@ -154,7 +142,8 @@ int main(int argc, char* argv[])
             return;
         }
         const int lines = printer.getDroppedRows() + job->getLineHitCount();
-        printError(resultText(*job, lines));
+        // The job's closing line, counting the rows the printer dropped too.
+        printError(FifJob::resultText(lines, job->getFileHitCount(), job->getReadFileCount()));
         app.exit(folderFailed ? 2 : lines > 0 ? 0 : 1);
     });
     job->start(request);

@@ -30,6 +30,8 @@ public:
 
     // A line number of 0 or more, and the job that found it still exists.
     bool isValid() const { return line >= 0 && !job.isNull(); }
+    // The first match is known and lies within the line's text.
+    bool hasMatchRange() const { return column >= 0 && length > 0 && column + length <= text.size(); }
     // "file (line): text" with native separators; empty for an invalid hit.
     QString toString() const;
     // The file's absolute canonical path, relative paths taken from the job's

@@ -33,7 +33,10 @@ QModelIndex FifHitsModel::index(int row, int column, const QModelIndex& parent) 
 
 QVariant FifHitsModel::data(const QModelIndex& index, int role) const
 {
-    if (!index.isValid())
+    // Views ask for many roles per row they paint; only these take the lock.
+    if (!index.isValid()
+        || (role != Qt::DisplayRole && role != Qt::ToolTipRole && role != Qt::StatusTipRole
+            && role != Qt::UserRole))
         return QVariant();
     FifHit hit;
     {

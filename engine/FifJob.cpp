@@ -124,9 +124,13 @@ int FifJob::getLineHitCount() const
 
 QString FifJob::getResultText() const
 {
-    return tr("Found %n line(s)", "", getLineHitCount())
-           + tr(" in %n file(s)", "", getFileHitCount())
-           + tr(" out of %n file(s)", "", getReadFileCount());
+    return resultText(getLineHitCount(), getFileHitCount(), getReadFileCount());
+}
+
+QString FifJob::resultText(int lines, int files, int readFiles)
+{
+    return tr("Found %n line(s)", "", lines) + tr(" in %n file(s)", "", files)
+           + tr(" out of %n file(s)", "", readFiles);
 }
 
 FifInput FifJob::getInput() const
@@ -189,7 +193,8 @@ void FifJob::postSearching(const QString& file)
 
 void FifJob::postHit(const FifHit& hit)
 {
-    outbox->postHit(hit);
+    // Delivered as appendHit() would take it: a list of one.
+    outbox->postHits(FifHitList{hit});
 }
 
 void FifJob::postHits(const FifHitList& hits)

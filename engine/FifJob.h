@@ -57,9 +57,11 @@ public:
     void incrementFileHitCount();
     // The number of rows of the hits model, 0 while there is none.
     int getLineHitCount() const;
-    // The counts of the search as the results view and `fif` show them at
-    // its end: "Found %n line(s) in %n file(s) out of %n file(s)".
+    // The counts of the search as the results view shows them at its end:
+    // "Found %n line(s) in %n file(s) out of %n file(s)".
     QString getResultText() const;
+    // The same text for counts of its own (`fif` counts rows it dropped).
+    static QString resultText(int lines, int files, int readFiles);
 
     FifInput getInput() const;
     QDir getWorkingDir() const;

@@ -24,11 +24,6 @@ void FifOutbox::postSearching(const QString& file)
     post(Event{Event::Searching, 1, file, FifHitList()});
 }
 
-void FifOutbox::postHit(const FifHit& hit)
-{
-    post(Event{Event::Hit, 1, QString(), FifHitList{hit}});
-}
-
 void FifOutbox::postHits(const FifHitList& hits)
 {
     post(Event{Event::Hits, hits.size(), QString(), hits});
@@ -124,9 +119,6 @@ FifOutbox::Outcome FifOutbox::deliver(qint64 sliceNs)
         switch (event.kind) {
         case Event::Searching:
             emit job->searching(event.file);
-            break;
-        case Event::Hit:
-            job->appendHit(event.hits.constFirst());
             break;
         case Event::Hits:
             job->appendHits(event.hits);

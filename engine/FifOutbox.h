@@ -36,7 +36,6 @@ public:
     // Any thread; events posted from the job's own thread are delivered at
     // once, after those waiting.
     void postSearching(const QString& file);
-    void postHit(const FifHit& hit);
     void postHits(const FifHitList& hits);
     // While set, posting does not wait for room.
     void setInterrupted(bool interrupted);
@@ -57,7 +56,7 @@ public:
 private:
     struct Event
     {
-        enum Kind { Searching, Hit, Hits };
+        enum Kind { Searching, Hits };
         Kind kind = Searching;
         qsizetype weight = 0;  // the hits it carries, or 1
         QString file;

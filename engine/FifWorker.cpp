@@ -72,7 +72,7 @@ void FifWorker::searchFolders()
     pool.reset();
 }
 
-void FifWorker::addFolder(QDir& folder, QList<QDir>& folders)
+void FifWorker::addFolder(const QDir& folder, QList<QDir>& folders)
 {
     if (folder.exists())
         folders.append(folder);

@@ -49,7 +49,7 @@ protected:
     virtual void searchFolder(const QDir& folder);
 
 private:
-    void addFolder(QDir& folder, QList<QDir>& folders);
+    void addFolder(const QDir& folder, QList<QDir>& folders);
     bool shouldStop() const;
     // The pool's reports, in walk order: the counters are raised and the
     // signals emitted here, batching the hits.

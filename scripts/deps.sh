@@ -20,8 +20,7 @@ fif_install_packages() {
 # What building the library, the application and the tests needs.
 FIF_BUILD_PACKAGES=(cmake ninja-build g++ pkg-config libgl-dev libpcre2-dev
   qt6-base-dev qt6-5compat-dev qt6-tools-dev qt6-tools-dev-tools qt6-l10n-tools
-  libqt6svg6 qt6-qpa-plugins fonts-dejavu-core
-  desktop-file-utils)  # the test of the installed desktop entry validates it
+  libqt6svg6 qt6-qpa-plugins fonts-dejavu-core)
 # What the sanitizer builds and the fuzz targets need besides: clang with its
 # runtime libraries (libFuzzer, ASan, UBSan, TSan).
 FIF_CHECK_PACKAGES=(clang libclang-rt-14-dev)

@@ -23,8 +23,7 @@ FifHitDelegate::Range FifHitDelegate::matchRange(const QModelIndex& index)
 FifHitDelegate::Range FifHitDelegate::matchRange(const QString& displayText, const FifHit& hit)
 {
     // The line's text ends the display text, whatever the file's name holds.
-    if (hit.column < 0 || hit.length <= 0 || hit.column + hit.length > hit.text.size()
-        || !displayText.endsWith(hit.text))
+    if (!hit.hasMatchRange() || !displayText.endsWith(hit.text))
         return Range();
     return Range{int(displayText.size() - hit.text.size()) + hit.column, hit.length};
 }
@@ -34,18 +33,25 @@ void FifHitDelegate::paint(QPainter* painter, const QStyleOptionViewItem& option
 {
     QStyleOptionViewItem opt = option;
     initStyleOption(&opt, index);
-    Range range = matchRange(opt.text, index.data(Qt::UserRole).value<FifHit>());
     const QWidget* widget = opt.widget;
     QStyle* style = widget ? widget->style() : QApplication::style();
-    // Within the space the style gives the text, as it lays text out.
-    const int margin = style->pixelMetric(QStyle::PM_FocusFrameHMargin, nullptr, widget) + 1;
-    const QRect textRect = style->subElementRect(QStyle::SE_ItemViewItemText, &opt, widget)
-                               .adjusted(margin, 0, -margin, 0);
-    const QString text = opt.fontMetrics.elidedText(opt.text, Qt::ElideRight, textRect.width());
-    if (range.length > 0 && text != opt.text) // the kept characters, then an ellipsis
-        range.length = qMin(range.start + range.length, int(text.size()) - 1) - range.start;
-    if (range.length <= 0 || opt.textElideMode != Qt::ElideRight) {
-        QStyledItemDelegate::paint(painter, option, index);
+    // Rows without a match to show are painted as the style paints them.
+    Range range = opt.textElideMode == Qt::ElideRight
+                      ? matchRange(opt.text, index.data(Qt::UserRole).value<FifHit>())
+                      : Range();
+    QRect textRect;
+    QString text;
+    if (range.length > 0) {
+        // Within the space the style gives the text, as it lays text out.
+        const int margin = style->pixelMetric(QStyle::PM_FocusFrameHMargin, nullptr, widget) + 1;
+        textRect = style->subElementRect(QStyle::SE_ItemViewItemText, &opt, widget)
+                       .adjusted(margin, 0, -margin, 0);
+        text = opt.fontMetrics.elidedText(opt.text, Qt::ElideRight, textRect.width());
+        if (text != opt.text) // the kept characters, then an ellipsis
+            range.length = qMin(range.start + range.length, int(text.size()) - 1) - range.start;
+    }
+    if (range.length <= 0) {
+        style->drawControl(QStyle::CE_ItemViewItem, &opt, painter, widget);
         return;
     }
 
